@@ -1,0 +1,7 @@
+#ifndef FWZEL_EXPORT_H
+#define FWZEL_EXPORT_H
+
+/// Marks what libFwZel.so exports; everything else in the library is hidden.
+#define FWZEL_API __attribute__((visibility("default")))
+
+#endif
