@@ -68,8 +68,24 @@ public:
     static void fillTextureColour(Texture* tex, uint32_t Cr, uint32_t Y, uint32_t Cb, uint32_t K,
                                   uint32_t fid);
 
+    /// Fills a host buffer of a texture from a picture file, by the reader that the file name's last four
+    /// characters choose: ".png" fillTextureFromPngFile() (PngFile.h), ".ppm" fillTextureFromPpmFile()
+    /// (PpmFile.h), in lower case. Any other extension does nothing. What is written, and of which files,
+    /// stands with the readers; pictureRefusal() (PictureRefusal.h) tells in words why a file is refused.
+    /// @param texBufIndex  buffer, reduced by the texture
+    /// @param fid          0 even field, 1 odd field, 2 whole frame
+    /// @param shift        extra left shift of integer samples in bits (PPM only), 0 for none
+    /// @param isFp16       two-byte components are half floats (PPM only: of PNG files they always are)
+    /// @throw std::out_of_range  the name is shorter than four characters
     static void fillTextureFile(std::string filename, Texture* tex, uint32_t texBufIndex, uint32_t fid,
                                 uint32_t shift, bool isFp16);
+
+    /// Reads a picture file's size by the reader that fillTextureFile() takes.
+    /// @param width,height  pixels, as the file declares them: any 32-bit number
+    /// @param bytePerCol    1 or 2: the size of the file's samples, which the readers convert from
+    /// @return the reader's result: 0, or -1 for a file that cannot be opened or whose header is refused. An
+    ///         extension without a reader gives 0 and writes nothing: preset width and height to 0 to tell.
+    /// @throw std::out_of_range  the name is shorter than four characters
     static int getWidthHeightFromFile(std::string fname, uint32_t* width, uint32_t* height,
                                       uint32_t* bytePerCol);
 
