@@ -1,0 +1,285 @@
+#include <FwZel/VideoTestImage.h>
+
+#include <FwZel/HalfFloat.h>
+#include <FwZel/PatternPixels.h>
+#include <FwZel/PixelRows.h>
+
+#include <algorithm>
+
+namespace {
+
+struct Region {
+    uint32_t posX, posY, sizeX, sizeY;
+};
+
+/// Where each component of a pixel lies in memory, counted in components.
+struct MemoryOrder {
+    uint32_t r, g, b, a;
+};
+
+MemoryOrder memoryOrderOf(uint32_t colOrder) {
+    switch (colOrder) {
+    case VideoTestImage::COL_ARGB:
+        return {1, 2, 3, 0};
+    case VideoTestImage::COL_RGBA:
+        return {0, 1, 2, 3};
+    case VideoTestImage::COL_ABGR:
+        return {3, 2, 1, 0};
+    default:
+        return {2, 3, 0, 1};
+    }
+}
+
+static_assert(__BYTE_ORDER__ == __ORDER_LITTLE_ENDIAN__, "the first component in memory is the lowest bits");
+
+// --- The layouts of a pixel. Each encodes a run of components, four a pixel, into pixels.
+
+struct PackedBytes {
+    using Pixel = uint32_t;
+    static constexpr uint32_t COMPONENTS = COMPONENTS_PER_PIXEL;
+
+    void encode(const uint32_t* components, uint32_t count, Pixel* pixels) const {
+        constexpr uint32_t BITS = 8;
+        for (uint32_t i = 0; i < count; ++i, components += COMPONENTS_PER_PIXEL)
+            pixels[i] = (components[0] & 0xFF) << BITS * order.r | (components[1] & 0xFF) << BITS * order.g |
+                        (components[2] & 0xFF) << BITS * order.b | (components[3] & 0xFF) << BITS * order.a;
+    }
+
+    static constexpr uint32_t wanted() { return PatternPicture::ALL_COMPONENTS; }
+
+    MemoryOrder order;
+};
+
+struct PackedHalfFloats {
+    using Pixel = uint64_t;
+    static constexpr uint32_t COMPONENTS = COMPONENTS_PER_PIXEL;
+
+    void encode(const uint32_t* components, uint32_t count, Pixel* pixels) const {
+        constexpr uint32_t BITS = 16;
+        const auto half = [](uint32_t code) { return Pixel{HALF_FLOAT_CODES[code & 0xFF]}; };
+        for (uint32_t i = 0; i < count; ++i, components += COMPONENTS_PER_PIXEL)
+            pixels[i] = half(components[0]) << BITS * order.r | half(components[1]) << BITS * order.g |
+                        half(components[2]) << BITS * order.b | half(components[3]) << BITS * order.a;
+    }
+
+    static constexpr uint32_t wanted() { return PatternPicture::ALL_COMPONENTS; }
+
+    MemoryOrder order;
+};
+
+template <class Element>
+struct Plane {
+    using Pixel = Element;
+    static constexpr uint32_t COMPONENTS = 1;
+
+    void encode(const uint32_t* components, uint32_t count, Pixel* pixels) const {
+        for (uint32_t i = 0; i < count; ++i)
+            pixels[i] = static_cast<Element>(components[i * COMPONENTS_PER_PIXEL + component]);
+    }
+
+    uint32_t wanted() const { return 1U << component; }
+
+    uint32_t component;
+};
+
+// --- The fillers
+
+/// Fills a region from left to right in pieces of columns, each from top to bottom: computes one line of each
+/// sort and copies it to the others.
+template <class Layout>
+class PatternFiller {
+public:
+    using Pixel = typename Layout::Pixel;
+
+    PatternFiller(const Layout& layout, const PatternPicture& picture, unsigned char* mem, uint32_t pitch)
+        : mLayout(layout), mPicture(picture), mRows(mem, pitch, Layout::COMPONENTS) {
+        mPicture.wanted = layout.wanted();
+    }
+
+    void fill(const Region& region) {
+        const uint32_t endX = region.posX + region.sizeX;
+        mBegin = region.posY;
+        mEnd = region.posY + region.sizeY;
+        if (mBegin >= mEnd)
+            return;
+        for (uint32_t x = region.posX; x < endX; x += mCount) {
+            mX = x;
+            mCount = std::min(endX - x, PIECE);
+            fillColumns();
+        }
+    }
+
+private:
+    static constexpr uint32_t PIECE = 65536 / sizeof(Pixel);
+    static constexpr uint32_t COMPUTED_AT_ONCE = 256;
+
+    void fillColumns() {
+        switch (lineVariationOf(mPicture.pattern)) {
+        case LineVariation::BANDS:
+            return fillBands();
+        case LineVariation::SHIFTED:
+            return fillShifted();
+        case LineVariation::SPAN:
+            return fillSpans();
+        case LineVariation::SEPARABLE:
+            return isConstantAlongLines() ? fillFlatLines() : fillSeparable();
+        }
+    }
+
+    void fillBands() {
+        bool isBuilt = false;
+        uint32_t built = 0;
+        for (uint32_t y = mBegin; y < mEnd;) {
+            const Band band = bandAt(mPicture, y, mEnd);
+            if (band.isFlat) {
+                repeatOnLines(y, band.end, pixelAt(mX, y));
+            } else {
+                if (!isBuilt || built != band.like)
+                    build(mX, y, mCount);
+                isBuilt = true;
+                built = band.like;
+                copyToLines(y, band.end);
+            }
+            y = band.end;
+        }
+    }
+
+    /// The piece holds line 0 from a column that is a multiple of the period on, one period more than it
+    /// fills.
+    void fillShifted() {
+        build(mX % DIAGONAL_PERIOD, 0, mCount + DIAGONAL_PERIOD);
+        for (uint32_t y = mBegin; y < mEnd; ++y)
+            mRows.copy(mX, y, mPiece + DIAGONAL_PERIOD - y % DIAGONAL_PERIOD, mCount);
+    }
+
+    void fillSpans() {
+        build(mX, mBegin, mCount);
+        Span held = clipped(spanAt(mPicture, mBegin));
+        for (uint32_t y = mBegin; y < mEnd; ++y) {
+            const Span whole = spanAt(mPicture, y);
+            const Span span = clipped(whole);
+            if (span.begin != held.begin || span.end != held.end) {
+                const Pixel outside = pixelAt(whole.end, y);
+                put(held.begin, std::min(held.end, span.begin), outside);
+                put(std::max(held.begin, span.end), held.end, outside);
+                const Pixel inside = pixelAt(whole.begin, y);
+                put(span.begin, std::min(span.end, held.begin), inside);
+                put(std::max(span.begin, held.end), span.end, inside);
+                held = span;
+            }
+            mRows.copy(mX, y, mPiece, mCount);
+        }
+    }
+
+    void fillSeparable() {
+        build(mX, mBegin, mCount);
+        Pixel held = pixelAt(mX, mBegin);
+        for (uint32_t y = mBegin; y < mEnd;) {
+            const Band band = bandAt(mPicture, y, mEnd);
+            const Pixel pixel = pixelAt(mX, y);
+            if (pixel != held)
+                for (uint32_t i = 0; i < mCount; ++i)
+                    mPiece[i] = static_cast<Pixel>(mPiece[i] ^ held ^ pixel);
+            held = pixel;
+            copyToLines(y, band.end);
+            y = band.end;
+        }
+    }
+
+    void fillFlatLines() {
+        for (uint32_t y = mBegin; y < mEnd; ++y)
+            mRows.repeat(mX, y, pixelAt(mX, y), mCount);
+    }
+
+    bool isConstantAlongLines() const { return mPicture.wanted == 1U << SEPARABLE_LINE_COMPONENT; }
+
+    void build(uint32_t x, uint32_t y, uint32_t count) {
+        uint32_t components[COMPUTED_AT_ONCE * COMPONENTS_PER_PIXEL];
+        for (uint32_t done = 0, chunk = 0; done < count; done += chunk) {
+            chunk = std::min(count - done, COMPUTED_AT_ONCE);
+            patternPixels(mPicture, x + done, y, chunk, components);
+            mLayout.encode(components, chunk, mPiece + done);
+        }
+    }
+
+    Pixel pixelAt(uint32_t x, uint32_t y) const {
+        uint32_t components[COMPONENTS_PER_PIXEL];
+        patternPixels(mPicture, x, y, 1, components);
+        Pixel pixel;
+        mLayout.encode(components, 1, &pixel);
+        return pixel;
+    }
+
+    void copyToLines(uint32_t begin, uint32_t end) const {
+        for (uint32_t y = begin; y < end; ++y)
+            mRows.copy(mX, y, mPiece, mCount);
+    }
+
+    void repeatOnLines(uint32_t begin, uint32_t end, Pixel pixel) const {
+        for (uint32_t y = begin; y < end; ++y)
+            mRows.repeat(mX, y, pixel, mCount);
+    }
+
+    /// In columns of the piece.
+    Span clipped(const Span& span) const {
+        const auto inPiece = [&](uint32_t x) { return std::clamp(x, mX, mX + mCount) - mX; };
+        return {inPiece(span.begin), inPiece(span.end)};
+    }
+
+    void put(uint32_t begin, uint32_t end, Pixel pixel) {
+        if (begin < end)
+            std::fill(mPiece + begin, mPiece + end, pixel);
+    }
+
+    Layout mLayout;
+    PatternPicture mPicture;
+    PixelRows<Pixel> mRows;
+
+    // The lines of the region, and the columns that are being filled.
+    uint32_t mBegin = 0;
+    uint32_t mEnd = 0;
+    uint32_t mX = 0;
+    uint32_t mCount = 0;
+
+    Pixel mPiece[PIECE + DIAGONAL_PERIOD]; ///< the part of one line that lies in these columns
+};
+
+template <class Layout>
+void fillPattern(unsigned char* mem, uint32_t pitch, const Layout& layout, PatternPicture picture,
+                 const Region& region) {
+    float bars[24];
+    VideoTestImage::generateColorBarData(bars, bars + 8, bars + 16, picture.pattern, 1);
+    picture.bars = bars;
+    PatternFiller<Layout>(layout, picture, mem, pitch).fill(region);
+}
+
+} // namespace
+
+void VideoTestImage::fillTestPattern(unsigned char* mem, uint32_t colOrder, uint32_t width, uint32_t height,
+                                     uint32_t pitch, uint32_t sig_sel, uint32_t fd, uint32_t posX,
+                                     uint32_t posY, uint32_t sizeX, uint32_t sizeY, bool isFp16) {
+    const PatternPicture picture = {sig_sel, width, height, 1, fd, nullptr};
+    const Region region = {posX, posY, sizeX, sizeY};
+    if (isFp16)
+        fillPattern(mem, pitch, PackedHalfFloats{memoryOrderOf(colOrder)}, picture, region);
+    else
+        fillPattern(mem, pitch, PackedBytes{memoryOrderOf(colOrder)}, picture, region);
+}
+
+void VideoTestImage::fillTestPatternPlanar(unsigned char* mem, uint32_t width, uint32_t height,
+                                           uint32_t pitch, uint32_t sig_sel, uint32_t fd, uint32_t colour,
+                                           uint32_t byte_per_col, uint32_t posX, uint32_t posY,
+                                           uint32_t sizeX, uint32_t sizeY) {
+    const PatternPicture picture = {sig_sel, width, height, byte_per_col, fd, nullptr};
+    const Region region = {posX, posY, sizeX, sizeY};
+    switch (byte_per_col) {
+    case 1:
+        return fillPattern(mem, pitch, Plane<uint8_t>{colour}, picture, region);
+    case 2:
+        return fillPattern(mem, pitch, Plane<uint16_t>{colour}, picture, region);
+    case 4:
+        return fillPattern(mem, pitch, Plane<uint32_t>{colour}, picture, region);
+    default:
+        return;
+    }
+}
