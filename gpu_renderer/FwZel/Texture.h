@@ -226,21 +226,35 @@ private:
     Texture& operator=(const Texture&) = delete;
 
     uint32_t bufferIndex(uint32_t fid) const { return fid & (mNumBuffers - 1); }
+    bool isWriteAccess() const;
+    uint32_t pixelBytes() const;
+    uint32_t hostBufBytes();
+    bool hostBufFits() const;
 
-    // The private operations take a buffer index below mNumBuffers, not reduced.
     void setArgsCommon(const TexArgs& args);
+    void setSize(uint32_t width, uint32_t frameHeight, uint32_t pitchInPix);
     void setArgsForTestPattern(const TexArgs& args);
     int setArgsForFile(const TexArgs& args);
+    uint32_t ceil(uint32_t in, uint32_t alignByte);
+
+    // From here to deleteGLBufObjects: a buffer index below mNumBuffers, not reduced.
     void createTextureForTestPattern();
     void createTextureForFile();
     void resizeBuffers(int num_buf);
+    uint32_t fieldOfBuffer(uint32_t buf_num) const;
     void allocHostBufs(uint32_t fid);
+    void clearHostBuf(uint32_t buf_num);
+    bool fillFitsHostBuf(uint32_t bytesPerElement);
     void createGLBufObjects(uint32_t fid);
     void createGLTex(uint32_t buf_num);
     void createPBO(uint32_t buf_num);
     void createFBO(uint32_t buf_num);
     void deleteGLBufObjects(uint32_t fid);
-    uint32_t ceil(uint32_t in, uint32_t alignByte);
+
+    void release();
+    void specifyLevel0(const void* pixels) const;
+    void uploadFromPBO(uint32_t fidPBO, uint32_t fidGLTex);
+    void writePBO(uint32_t fidHostBuf, uint32_t fidPBO);
     void dumpBuf(void* ptr);
 
     uint32_t mTestPattern;

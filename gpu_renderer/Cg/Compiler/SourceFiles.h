@@ -9,7 +9,6 @@
 #include <optional>
 #include <string>
 #include <string_view>
-#include <unordered_map>
 #include <vector>
 
 namespace cg {
@@ -31,7 +30,7 @@ public:
     /// The whole text; a view into it lives as long as this object.
     std::string_view text(std::uint32_t file) const { return mFiles[file].text; }
 
-    /// One line without its line end; empty for a line that the file has not. Searches from the file's start.
+    /// One line without its line end; empty for a line that the file has not.
     /// @param line  from 1, counted in the file itself
     std::string_view line(std::uint32_t file, std::uint32_t line) const;
 
@@ -61,11 +60,11 @@ private:
     struct File {
         std::string name;
         std::string text;
+        std::vector<std::size_t> lineStarts;   ///< built by the first line()
         std::vector<Renumbering> renumberings; ///< by line
     };
 
     std::deque<File> mFiles; ///< a deque: texts stay where they are
-    std::unordered_map<std::string_view, std::uint32_t> mIndexByName;
     Arena mSpellings;
 };
 

@@ -1,0 +1,155 @@
+#include <fixture/GlTest.h>
+#include <fixture/TextureCalls.h>
+
+#include <FwZel/Texture.h>
+#include <FwZel/VideoTestImage.h>
+
+#include <array>
+#include <atomic>
+#include <cstring>
+#include <thread>
+
+namespace {
+
+using Calls = std::vector<std::string>;
+
+Texture::TexArgs pboArgs(uint32_t access = GL_WRITE_ONLY, uint32_t numBuffers = 2) {
+    Texture::TexArgs args;
+    Texture::setDefaultValue(args);
+    args.width = args.pitchInPix = 16;
+    args.height = 8;
+    args.isPBO = true;
+    args.numBuffers = numBuffers;
+    args.pboAccessType = access;
+    return args;
+}
+
+using PboMapping = GlTest;
+
+alignas(64) std::array<uint8_t, 1024> mappedMemory;
+uint8_t* nextMapping = nullptr;
+
+/// Makes every mapping land where a test wants it.
+class MappingAt {
+public:
+    explicit MappingAt(uint8_t* address)
+        : mMap(
+              "glMapBuffer", epoxy_glMapBuffer, +[](GLenum, GLenum) -> void* { return nextMapping; }),
+          mUnmap(
+              "glUnmapBuffer", epoxy_glUnmapBuffer, +[](GLenum) -> GLboolean { return GL_TRUE; }) {
+        nextMapping = address;
+    }
+
+private:
+    SwappedEntryPoint<PFNGLMAPBUFFERPROC> mMap;
+    SwappedEntryPoint<PFNGLUNMAPBUFFERPROC> mUnmap;
+};
+
+TEST_F(PboMapping, DataStartsAtTheNextAlignedAddress) {
+    struct Case {
+        uint32_t mappedAt, alignment, offset;
+    };
+    for (const Case& c : {Case{8, 16, 8}, Case{16, 16, 0}, Case{1, 64, 63}, Case{3, 1, 0}, Case{5, 0, 0}}) {
+        Texture::TexArgs args = pboArgs();
+        args.pboAlignByte = c.alignment;
+        Texture texture(VideoTestImage::H_RAMP, args);
+        const MappingAt mapping(mappedMemory.data() + c.mappedAt);
+        mappedMemory.fill(0xEE);
+        texture.copyHostBufToPBO(1);
+        EXPECT_EQ(texture.getPboOffset(3), c.offset);
+        EXPECT_EQ(texture.getPboPtr(1), mappedMemory.data() + c.mappedAt) << "still the released mapping's";
+        uint8_t* const data = mappedMemory.data() + c.mappedAt + c.offset;
+        EXPECT_EQ(texture.getAlignedPboPtr(1), data);
+        EXPECT_EQ(std::memcmp(data, texture.getHostBufPtr(1), texture.pixelBytes()), 0);
+        EXPECT_EQ(data[-1], 0xEE);
+        EXPECT_EQ(data[texture.pixelBytes()], 0xEE);
+        EXPECT_EQ(texture.getPboOffset(0), texture.mPboOffsets[0]) << "the other buffer keeps its own";
+    }
+}
+
+TEST_F(PboMapping, ReadbackComesFromTheStartOfTheMapping) {
+    Texture texture(VideoTestImage::COLOUR_MAT_BLACK, pboArgs(GL_READ_ONLY));
+    const MappingAt mapping(mappedMemory.data() + 8);
+    for (size_t i = 0; i < mappedMemory.size(); ++i)
+        mappedMemory[i] = static_cast<uint8_t>(i * 7);
+    texture.readbackPBOToHostBuf(0);
+    EXPECT_EQ(texture.getPboOffset(0), 8U);
+    EXPECT_EQ(std::memcmp(texture.getHostBufPtr(0), mappedMemory.data() + 8, texture.pixelBytes()), 0);
+}
+
+TEST_F(PboMapping, AFailedMappingLeavesThePboBound) {
+    for (const uint32_t access : {uint32_t{GL_WRITE_ONLY}, uint32_t{GL_READ_ONLY}}) {
+        const bool isUpload = access == GL_WRITE_ONLY;
+        Texture texture(VideoTestImage::COMBI, pboArgs(access));
+        GLint bound = 0;
+        const MappingAt mapping(nullptr);
+        texture.mapPbo(3);
+        EXPECT_EQ(takeLog(),
+                  (std::vector<LogMessage>{{3, "GPUR 457: Texture::mapPbo : glMapBuffer() failed\n"}}));
+        glGetIntegerv(isUpload ? GL_PIXEL_UNPACK_BUFFER_BINDING : GL_PIXEL_PACK_BUFFER_BINDING, &bound);
+        EXPECT_EQ(static_cast<uint32_t>(bound), texture.getPboID(1));
+        EXPECT_EQ(texture.getPboPtr(1), nullptr);
+        EXPECT_EQ(texture.getAlignedPboPtr(1), nullptr);
+        EXPECT_EQ(texture.getPboOffset(1), 0U);
+
+        GlCallRecorder recorder;
+        watchTextureCalls(recorder);
+        texture.unmapPbo(3);
+        EXPECT_EQ(recorder.take(), Calls{});
+        EXPECT_EQ(takeLog(), (std::vector<LogMessage>{
+                                 {3, isUpload ? "GPUR 458: Texture::unmapPbo(): mPboPtrs[1] = NULL\n"
+                                              : "GPUR 459: Texture::unmapPbo(): mPboPtrs[1] = NULL\n"}}));
+        glBindBuffer(isUpload ? GL_PIXEL_UNPACK_BUFFER : GL_PIXEL_PACK_BUFFER, 0);
+    }
+}
+
+TEST_F(PboMapping, UnmappingTwiceFailsAndLeavesThePboBound) {
+    Texture texture(VideoTestImage::COMBI, pboArgs());
+    texture.mapPbo(1);
+    texture.unmapPbo(1);
+    texture.unmapPbo(1);
+    EXPECT_EQ(takeLog(),
+              (std::vector<LogMessage>{{3, "GPUR 460: Texture::unmapPbo : glUnmapBuffer() failed\n"}}));
+    EXPECT_EQ(takeGlErrors(), Calls{"GL_INVALID_OPERATION"});
+    GLint bound = 0;
+    glGetIntegerv(GL_PIXEL_UNPACK_BUFFER_BINDING, &bound);
+    EXPECT_EQ(static_cast<uint32_t>(bound), texture.getPboID(1));
+    glBindBuffer(GL_PIXEL_UNPACK_BUFFER, 0);
+}
+
+// The mapping is awaited as a host would agree on it between its threads: by a frame counter of its own.
+TEST_F(PboMapping, EveryFrameOfAProducerThreadArrivesWhole) {
+    constexpr uint32_t BUFFERS = 4;
+    constexpr int FRAMES = 2000;
+    Texture texture(VideoTestImage::NO_TEST_PATTERN, pboArgs(GL_WRITE_ONLY, BUFFERS));
+    const size_t frameBytes = texture.pixelBytes();
+    std::atomic<int> framesMapped{0};
+    std::atomic<int> framesWritten{0};
+    std::thread producer([&] {
+        for (int frame = 0; frame < FRAMES; ++frame) {
+            while (framesMapped.load(std::memory_order_acquire) <= frame)
+                (void)texture.getPboOffset(static_cast<uint32_t>(frame));
+            std::memset(texture.getAlignedPboPtr(static_cast<uint32_t>(frame)), frame & 0xFF, frameBytes);
+            framesWritten.store(frame + 1, std::memory_order_release);
+        }
+    });
+    std::vector<uint8_t> arrived(frameBytes);
+    int badFrames = 0;
+    for (int frame = 0; frame < FRAMES; ++frame) {
+        const auto b = static_cast<uint32_t>(frame);
+        texture.mapPbo(b);
+        framesMapped.store(frame + 1, std::memory_order_release);
+        while (framesWritten.load(std::memory_order_acquire) <= frame)
+            std::this_thread::yield();
+        texture.unmapPbo(b);
+        texture.copyPBOToGLTex(b);
+        glBindTexture(GL_TEXTURE_2D, texture.getGLTexID(b));
+        glGetTexImage(GL_TEXTURE_2D, 0, GL_RGBA, GL_UNSIGNED_BYTE, arrived.data());
+        glBindTexture(GL_TEXTURE_2D, 0);
+        badFrames += arrived != std::vector<uint8_t>(frameBytes, static_cast<uint8_t>(frame & 0xFF));
+    }
+    producer.join();
+    EXPECT_EQ(badFrames, 0);
+}
+
+} // namespace
