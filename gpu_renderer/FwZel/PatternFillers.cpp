@@ -3,6 +3,7 @@
 #include <FwZel/HalfFloat.h>
 #include <FwZel/PatternPixels.h>
 #include <FwZel/PixelRows.h>
+#include <FwZel/WordLoops.h>
 
 #include <algorithm>
 
@@ -32,17 +33,16 @@ MemoryOrder memoryOrderOf(uint32_t colOrder) {
 
 static_assert(__BYTE_ORDER__ == __ORDER_LITTLE_ENDIAN__, "the first component in memory is the lowest bits");
 
-// --- The layouts of a pixel. Each encodes a run of components, four a pixel, into pixels.
+// --- The layouts of a pixel
 
 struct PackedBytes {
     using Pixel = uint32_t;
     static constexpr uint32_t COMPONENTS = COMPONENTS_PER_PIXEL;
 
-    void encode(const uint32_t* components, uint32_t count, Pixel* pixels) const {
+    Pixel encode(uint32_t r, uint32_t g, uint32_t b, uint32_t a) const {
         constexpr uint32_t BITS = 8;
-        for (uint32_t i = 0; i < count; ++i, components += COMPONENTS_PER_PIXEL)
-            pixels[i] = (components[0] & 0xFF) << BITS * order.r | (components[1] & 0xFF) << BITS * order.g |
-                        (components[2] & 0xFF) << BITS * order.b | (components[3] & 0xFF) << BITS * order.a;
+        return (r & 0xFF) << BITS * order.r | (g & 0xFF) << BITS * order.g | (b & 0xFF) << BITS * order.b |
+               (a & 0xFF) << BITS * order.a;
     }
 
     static constexpr uint32_t wanted() { return PatternPicture::ALL_COMPONENTS; }
@@ -54,12 +54,11 @@ struct PackedHalfFloats {
     using Pixel = uint64_t;
     static constexpr uint32_t COMPONENTS = COMPONENTS_PER_PIXEL;
 
-    void encode(const uint32_t* components, uint32_t count, Pixel* pixels) const {
+    Pixel encode(uint32_t r, uint32_t g, uint32_t b, uint32_t a) const {
         constexpr uint32_t BITS = 16;
         const auto half = [](uint32_t code) { return Pixel{HALF_FLOAT_CODES[code & 0xFF]}; };
-        for (uint32_t i = 0; i < count; ++i, components += COMPONENTS_PER_PIXEL)
-            pixels[i] = half(components[0]) << BITS * order.r | half(components[1]) << BITS * order.g |
-                        half(components[2]) << BITS * order.b | half(components[3]) << BITS * order.a;
+        return half(r) << BITS * order.r | half(g) << BITS * order.g | half(b) << BITS * order.b |
+               half(a) << BITS * order.a;
     }
 
     static constexpr uint32_t wanted() { return PatternPicture::ALL_COMPONENTS; }
@@ -72,15 +71,35 @@ struct Plane {
     using Pixel = Element;
     static constexpr uint32_t COMPONENTS = 1;
 
-    void encode(const uint32_t* components, uint32_t count, Pixel* pixels) const {
-        for (uint32_t i = 0; i < count; ++i)
-            pixels[i] = static_cast<Element>(components[i * COMPONENTS_PER_PIXEL + component]);
-    }
-
     uint32_t wanted() const { return 1U << component; }
 
     uint32_t component;
 };
+
+template <class Layout>
+typename Layout::Pixel encodePixel(const Layout& layout, const PatternPixel& pixel) {
+    return layout.encode(pixel.r, pixel.g, pixel.b, pixel.a);
+}
+
+template <class Element>
+Element encodePixel(const Plane<Element>& plane, const PatternPixel& pixel) {
+    const uint32_t components[] = {pixel.r, pixel.g, pixel.b, pixel.a};
+    return static_cast<Element>(components[plane.component]);
+}
+
+template <class Layout>
+void encodeRun(const Layout& layout, const PatternRun& run, uint32_t count, typename Layout::Pixel* pixels) {
+    const auto& [r, g, b, a] = run.components;
+    for (uint32_t i = 0; i < count; ++i)
+        pixels[i] = layout.encode(r[i], g[i], b[i], a[i]);
+}
+
+template <class Element>
+void encodeRun(const Plane<Element>& plane, const PatternRun& run, uint32_t count, Element* pixels) {
+    const uint32_t* const component = run.components[plane.component];
+    for (uint32_t i = 0; i < count; ++i)
+        pixels[i] = static_cast<Element>(component[i]);
+}
 
 // --- The fillers
 
@@ -102,16 +121,14 @@ public:
         mEnd = region.posY + region.sizeY;
         if (mBegin >= mEnd)
             return;
-        for (uint32_t x = region.posX; x < endX; x += mCount) {
-            mX = x;
-            mCount = std::min(endX - x, PIECE);
+        for (mX = region.posX; mX < endX; mX += mCount) {
+            mCount = std::min(endX - mX, PIECE);
             fillColumns();
         }
     }
 
 private:
     static constexpr uint32_t PIECE = 65536 / sizeof(Pixel);
-    static constexpr uint32_t COMPUTED_AT_ONCE = 256;
 
     void fillColumns() {
         switch (lineVariationOf(mPicture.pattern)) {
@@ -177,9 +194,7 @@ private:
         for (uint32_t y = mBegin; y < mEnd;) {
             const Band band = bandAt(mPicture, y, mEnd);
             const Pixel pixel = pixelAt(mX, y);
-            if (pixel != held)
-                for (uint32_t i = 0; i < mCount; ++i)
-                    mPiece[i] = static_cast<Pixel>(mPiece[i] ^ held ^ pixel);
+            flipBits(mPiece, mCount * sizeof(Pixel), repeatedInWord(static_cast<Pixel>(held ^ pixel)));
             held = pixel;
             copyToLines(y, band.end);
             y = band.end;
@@ -194,21 +209,15 @@ private:
     bool isConstantAlongLines() const { return mPicture.wanted == 1U << SEPARABLE_LINE_COMPONENT; }
 
     void build(uint32_t x, uint32_t y, uint32_t count) {
-        uint32_t components[COMPUTED_AT_ONCE * COMPONENTS_PER_PIXEL];
-        for (uint32_t done = 0, chunk = 0; done < count; done += chunk) {
-            chunk = std::min(count - done, COMPUTED_AT_ONCE);
-            patternPixels(mPicture, x + done, y, chunk, components);
-            mLayout.encode(components, chunk, mPiece + done);
+        PatternRun run;
+        for (uint32_t done = 0, pixels = 0; done < count; done += pixels) {
+            pixels = std::min(count - done, PatternRun::MAX_PIXELS);
+            patternRun(mPicture, x + done, y, pixels, run);
+            encodeRun(mLayout, run, pixels, mPiece + done);
         }
     }
 
-    Pixel pixelAt(uint32_t x, uint32_t y) const {
-        uint32_t components[COMPONENTS_PER_PIXEL];
-        patternPixels(mPicture, x, y, 1, components);
-        Pixel pixel;
-        mLayout.encode(components, 1, &pixel);
-        return pixel;
-    }
+    Pixel pixelAt(uint32_t x, uint32_t y) const { return encodePixel(mLayout, patternPixel(mPicture, x, y)); }
 
     void copyToLines(uint32_t begin, uint32_t end) const {
         for (uint32_t y = begin; y < end; ++y)

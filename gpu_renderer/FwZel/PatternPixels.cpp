@@ -31,9 +31,7 @@ constexpr Depth depthOf(uint32_t bytesPerColour) {
 }
 static_assert(depthOf(3).max == 0xFF, "every other size works at one byte");
 
-struct Pixel {
-    uint32_t r, g, b, a;
-};
+using Pixel = PatternPixel;
 
 /// What a pattern is asked: a picture at one depth.
 struct Canvas : PatternPicture {
@@ -44,6 +42,7 @@ struct Canvas : PatternPicture {
     /// Luma in the second component, neutral chroma.
     Pixel luma(uint32_t code) const { return {depth.half, code, depth.half, depth.max}; }
     Pixel lineOn(bool isLine, uint32_t background) const { return luma(isLine ? depth.line() : background); }
+    bool isWanted(uint32_t component) const { return (wanted >> component & 1) != 0; }
     /// An 8-bit code at the top of a component.
     uint32_t top8(uint32_t code) const { return (code << depth.shift) & depth.max; }
     uint32_t top10(uint32_t code) const { return (code << depth.shift10bit) & depth.max; }
@@ -115,19 +114,11 @@ int32_t discHalfWidth(const PatternPicture& picture, uint32_t y) {
 
 struct Combi {
     static Pixel at(const Canvas& canvas, uint32_t x, uint32_t y) {
-        const uint32_t alongX = canvas.top8(x);
-        switch (y) {
-        case 0:
-            return {0, 0, alongX, 0};
-        case 1:
-            return {0, alongX, 0, 0};
-        case 2:
-            return {alongX, 0, 0, 0};
-        case 3:
-            return {0, 0, 0, alongX};
-        default:
-            return canvas.grey(y <= COMBI_LAST_VERTICAL_LINE ? canvas.top8(y) : alongX);
-        }
+        const bool isGrey = y >= COMBI_COMPONENT_LINES;
+        const uint32_t level = canvas.top8(isGrey && y <= COMBI_LAST_VERTICAL_LINE ? y : x);
+        // Masks rather than choices: a loop along the line then takes several pixels at a time.
+        const auto on = [&](uint32_t line) { return isGrey || y == line ? ~0U : 0; };
+        return {level & on(2), level & on(1), level & on(0), isGrey ? canvas.depth.max : level & on(3)};
     }
 };
 
@@ -241,7 +232,10 @@ struct ColourBar {
         const uint32_t barWidth = canvas.width / NUM_BARS;
         const uint32_t index = barWidth == 0 ? 0 : x / barWidth % NUM_BARS;
         const auto code = [&](uint32_t array) {
-            return truncated(canvas.bars[array * NUM_BARS + index] * canvas.depth.maxF) & canvas.depth.max;
+            return canvas.isWanted(array)
+                       ? truncated(canvas.bars[array * NUM_BARS + index] * canvas.depth.maxF) &
+                             canvas.depth.max
+                       : 0;
         };
         return {code(0), code(1), code(2), canvas.depth.max};
     }
@@ -250,16 +244,14 @@ struct ColourBar {
 struct HSweep {
     static Pixel at(const Canvas& canvas, uint32_t x, uint32_t) {
         constexpr float PI = 3.14159274f;
-        constexpr uint32_t LUMA = 1U << 1;
-        constexpr uint32_t CHROMA = 1U << 0 | 1U << 2;
         const auto position = static_cast<float>(x);
         const float kY = position * 0.5f / static_cast<float>(canvas.width);
         const float kC = kY * 0.5f;
         const auto code = [&](float phase) {
             return truncated((std::sin(phase) * 0.4f + 0.5f) * canvas.depth.maxF) & canvas.depth.max;
         };
-        const uint32_t chroma = (canvas.wanted & CHROMA) != 0 ? code(kC * position * PI) : 0;
-        const uint32_t luma = (canvas.wanted & LUMA) != 0 ? code(position * kY * PI) : 0;
+        const uint32_t chroma = canvas.isWanted(0) || canvas.isWanted(2) ? code(kC * position * PI) : 0;
+        const uint32_t luma = canvas.isWanted(1) ? code(position * kY * PI) : 0;
         return {chroma, luma, chroma, canvas.depth.max};
     }
 };
@@ -276,32 +268,48 @@ struct NoPattern {
     static Pixel at(const Canvas&, uint32_t, uint32_t) { return {0, 0, 0, 0}; }
 };
 
-/// One loop for each pattern, so that the choice of the pattern stays out of it.
+// Each pattern has its own loop, so that the choice of the pattern stays out of it.
+
+struct Operations {
+    Pixel (*pixel)(const PatternPicture&, uint32_t x, uint32_t y);
+    void (*run)(const PatternPicture&, uint32_t x, uint32_t y, uint32_t count, PatternRun&);
+};
+
 template <class Pattern>
-void pixelsOf(const PatternPicture& picture, uint32_t x, uint32_t y, uint32_t count, uint32_t* components) {
+Pixel pixelOf(const PatternPicture& picture, uint32_t x, uint32_t y) {
+    return Pattern::at(Canvas(picture), x, y);
+}
+
+template <class Pattern>
+void runOf(const PatternPicture& picture, uint32_t x, uint32_t y, uint32_t count, PatternRun& run) {
     const Canvas canvas(picture);
     for (uint32_t i = 0; i < count; ++i) {
         const Pixel pixel = Pattern::at(canvas, x + i, y);
-        components[i * COMPONENTS_PER_PIXEL + 0] = pixel.r;
-        components[i * COMPONENTS_PER_PIXEL + 1] = pixel.g;
-        components[i * COMPONENTS_PER_PIXEL + 2] = pixel.b;
-        components[i * COMPONENTS_PER_PIXEL + 3] = pixel.a;
+        run.components[0][i] = pixel.r;
+        run.components[1][i] = pixel.g;
+        run.components[2][i] = pixel.b;
+        run.components[3][i] = pixel.a;
     }
 }
 
-using PixelsOf = void (*)(const PatternPicture&, uint32_t, uint32_t, uint32_t, uint32_t*);
+template <class Pattern>
+constexpr Operations OF = {pixelOf<Pattern>, runOf<Pattern>};
 
 /// By pattern number.
-constexpr PixelsOf PATTERNS[] = {
-    pixelsOf<Combi>,          pixelsOf<HRamp>,          pixelsOf<VRamp>,      pixelsOf<HVRamp>,
-    pixelsOf<HRampSharow>,    pixelsOf<HRampSharowY>,   pixelsOf<HRamp10bit>, pixelsOf<HRamp10bit2>,
-    pixelsOf<HRampMaxval>,    pixelsOf<Centre>,         pixelsOf<WhiteFrame>, pixelsOf<HGrid>,
-    pixelsOf<VGrid>,          pixelsOf<HImpulse>,       pixelsOf<Circle>,     pixelsOf<DigonalLine>,
-    pixelsOf<ColourMats>,     pixelsOf<ColourBar>,      pixelsOf<ColourBar>,  pixelsOf<HSweep>,
-    pixelsOf<ColourMatBlack>, pixelsOf<ColourMatWhite>,
+constexpr Operations PATTERNS[] = {
+    OF<Combi>,          OF<HRamp>,          OF<VRamp>,       OF<HVRamp>,      OF<HRampSharow>,
+    OF<HRampSharowY>,   OF<HRamp10bit>,     OF<HRamp10bit2>, OF<HRampMaxval>, OF<Centre>,
+    OF<WhiteFrame>,     OF<HGrid>,          OF<VGrid>,       OF<HImpulse>,    OF<Circle>,
+    OF<DigonalLine>,    OF<ColourMats>,     OF<ColourBar>,   OF<ColourBar>,   OF<HSweep>,
+    OF<ColourMatBlack>, OF<ColourMatWhite>,
 };
 constexpr uint32_t NUM_PATTERNS = sizeof PATTERNS / sizeof PATTERNS[0];
 static_assert(NUM_PATTERNS == VideoTestImage::COLOUR_MAT_WHITE + 1, "one entry for each pattern number");
+
+const Operations& operationsOf(uint32_t pattern) {
+    static constexpr Operations NONE = OF<NoPattern>;
+    return pattern < NUM_PATTERNS ? PATTERNS[pattern] : NONE;
+}
 
 /// The first line after y at which a test turns out otherwise than at y, at most limit.
 template <class Test>
@@ -315,16 +323,22 @@ uint32_t endOfRun(uint32_t y, uint32_t limit, Test test) {
 
 } // namespace
 
-void patternPixels(const PatternPicture& picture, uint32_t x, uint32_t y, uint32_t count,
-                   uint32_t* components) {
-    const PixelsOf pixels = picture.pattern < NUM_PATTERNS ? PATTERNS[picture.pattern] : pixelsOf<NoPattern>;
-    pixels(picture, x, y, count, components);
+PatternPixel patternPixel(const PatternPicture& picture, uint32_t x, uint32_t y) {
+    return operationsOf(picture.pattern).pixel(picture, x, y);
+}
+
+void patternRun(const PatternPicture& picture, uint32_t x, uint32_t y, uint32_t count, PatternRun& run) {
+    operationsOf(picture.pattern).run(picture, x, y, count, run);
 }
 
 void VideoTestImage::generatePatternData(uint32_t sig_sel, uint32_t width, uint32_t height, uint32_t x,
                                          uint32_t y, uint32_t byte_per_col, uint32_t fd, uint32_t* data,
                                          float* colbarCol) {
-    patternPixels({sig_sel, width, height, byte_per_col, fd, colbarCol}, x, y, 1, data);
+    const Pixel pixel = patternPixel({sig_sel, width, height, byte_per_col, fd, colbarCol}, x, y);
+    data[0] = pixel.r;
+    data[1] = pixel.g;
+    data[2] = pixel.b;
+    data[3] = pixel.a;
 }
 
 LineVariation lineVariationOf(uint32_t pattern) {

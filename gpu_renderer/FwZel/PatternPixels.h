@@ -3,9 +3,8 @@
 
 #include <cstdint>
 
-// Private to the library: what the pixels of a pattern are, a run of them at a time, and how its lines
-// resemble one another. VideoTestImage::generatePatternData() is the run of one pixel; the fillers compute
-// one line of each sort and repeat it.
+// Private to the library: what the pixels of a pattern are, one or a run of them at a time, and how its lines
+// resemble one another, so that the fillers may compute one line of each sort and repeat it.
 
 inline constexpr uint32_t COMPONENTS_PER_PIXEL = 4;
 
@@ -24,10 +23,22 @@ struct PatternPicture {
     uint32_t wanted = ALL_COMPONENTS;
 };
 
-/// Computes count pixels of line y, from column x on, four components each. This is the definition of every
-/// pattern.
-void patternPixels(const PatternPicture& picture, uint32_t x, uint32_t y, uint32_t count,
-                   uint32_t* components);
+/// The components of one pixel.
+struct PatternPixel {
+    uint32_t r, g, b, a;
+};
+
+/// A run of pixels, component by component: loops over it need no shuffling.
+struct PatternRun {
+    static constexpr uint32_t MAX_PIXELS = 256;
+    uint32_t components[COMPONENTS_PER_PIXEL][MAX_PIXELS];
+};
+
+/// Computes the pixel at column x of line y. This is what VideoTestImage::generatePatternData() gives.
+PatternPixel patternPixel(const PatternPicture& picture, uint32_t x, uint32_t y);
+
+/// Computes that of the columns from x on, count of them, at most MAX_PIXELS.
+void patternRun(const PatternPicture& picture, uint32_t x, uint32_t y, uint32_t count, PatternRun& run);
 
 /// How the lines of a pattern differ.
 enum class LineVariation {

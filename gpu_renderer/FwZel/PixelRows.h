@@ -1,25 +1,14 @@
 #ifndef FWZEL_PIXELROWS_H
 #define FWZEL_PIXELROWS_H
 
+#include <FwZel/WordLoops.h>
+
 #include <algorithm>
 #include <cstddef>
 #include <cstdint>
 #include <cstring>
 
 // Private to the library: writing runs of pixels into the rows of a buffer at the speed of memory.
-
-/// Stores a 64-bit word over and over, the last time its first bytes only. The destination may lie anywhere.
-inline void storeRepeatedly(unsigned char* to, uint64_t word, size_t bytes) {
-    size_t words = bytes / sizeof word;
-#if defined(__x86_64__) && !defined(__SANITIZE_ADDRESS__) && !defined(__SANITIZE_THREAD__)
-    // Whole cache lines are claimed without being read first, which no loop of ordinary stores achieves.
-    asm volatile("rep stosq" : "+D"(to), "+c"(words) : "a"(word) : "memory");
-#else
-    for (; words > 0; --words, to += sizeof word)
-        std::memcpy(to, &word, sizeof word);
-#endif
-    std::memcpy(to, &word, bytes % sizeof word);
-}
 
 /// The pixels of a buffer in rows, pitch pixels apart. Writes only: the buffer may be a write-only mapping.
 ///
@@ -38,15 +27,9 @@ public:
     }
 
     void repeat(uint32_t x, uint32_t y, Pixel pixel, uint32_t count) const {
-        uint64_t word = 0;
-        for (size_t offset = 0; offset < sizeof word; offset += sizeof pixel)
-            std::memcpy(reinterpret_cast<unsigned char*>(&word) + offset, &pixel, sizeof pixel);
-        const bool isOneByte = word == (word & 0xFF) * 0x0101010101010101;
+        const uint64_t word = repeatedInWord(pixel);
         inPieces(x, y, count, [&](unsigned char* to, size_t, size_t piece) {
-            if (isOneByte)
-                std::memset(to, static_cast<int>(word & 0xFF), piece * sizeof(Pixel));
-            else
-                storeRepeatedly(to, word, piece * sizeof(Pixel));
+            storeRepeatedly(to, word, piece * sizeof(Pixel));
         });
     }
 
