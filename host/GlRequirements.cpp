@@ -13,21 +13,21 @@ namespace {
 /// because the library calls the entry points that only the extension has.
 struct Need {
     GlFeature feature;
-    const char* what;
     int version;
+    const char* what;
     const char* extension;
 };
 
 constexpr Need NEEDS[] = {
-    {GlFeature::TEXTURES, "textures of any size", 20, "GL_ARB_texture_non_power_of_two"},
-    {GlFeature::FRAMEBUFFERS, "framebuffers and mip maps", 0, "GL_EXT_framebuffer_object"},
-    {GlFeature::UPLOAD_BUFFERS, "upload through pixel buffers", 21, "GL_ARB_pixel_buffer_object"},
-    {GlFeature::READBACK_BUFFERS, "readback through pixel buffers", 21, "GL_ARB_pixel_buffer_object"},
-    {GlFeature::READBACK_BUFFERS, "readback from framebuffers", 0, "GL_EXT_framebuffer_object"},
-    {GlFeature::READBACK_BUFFERS, "copies between buffers", 31, "GL_ARB_copy_buffer"},
-    {GlFeature::HALF_FLOATS, "half-float textures", 30, "GL_ARB_texture_float"},
-    {GlFeature::HALF_FLOATS, "half-float pixels", 30, "GL_ARB_half_float_pixel"},
-    {GlFeature::FRAMEBUFFER_BLIT, "copies between framebuffers", 0, "GL_EXT_framebuffer_blit"},
+    {GlFeature::TEXTURES, 20, "textures of any size", "GL_ARB_texture_non_power_of_two"},
+    {GlFeature::FRAMEBUFFERS, 0, "framebuffers and mip maps", "GL_EXT_framebuffer_object"},
+    {GlFeature::UPLOAD_BUFFERS, 21, "upload through pixel buffers", "GL_ARB_pixel_buffer_object"},
+    {GlFeature::READBACK_BUFFERS, 21, "readback through pixel buffers", "GL_ARB_pixel_buffer_object"},
+    {GlFeature::READBACK_BUFFERS, 0, "readback from framebuffers", "GL_EXT_framebuffer_object"},
+    {GlFeature::READBACK_BUFFERS, 31, "copies between buffers", "GL_ARB_copy_buffer"},
+    {GlFeature::HALF_FLOATS, 30, "half-float textures", "GL_ARB_texture_float"},
+    {GlFeature::HALF_FLOATS, 30, "half-float pixels", "GL_ARB_half_float_pixel"},
+    {GlFeature::FRAMEBUFFER_BLIT, 0, "copies between framebuffers", "GL_EXT_framebuffer_blit"},
 };
 
 bool isMet(const Need& need) {
