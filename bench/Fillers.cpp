@@ -1,8 +1,7 @@
 // The fillers beside the limit of the memory: ROWCOPY, memcpy of one prepared row to every line of the same
 // buffer.
-//
-// A row is called GROUP/SIZE/CASE. In each GROUP/SIZE, the case "limit" is what the others are measured
-// against, and "limit-again" measures it against itself. bench/compare knows the targets of the groups.
+
+#include "BenchmarkRow.h"
 
 #include <FwZel/TestPatternCatalogue.h>
 #include <FwZel/VideoTestImage.h>
@@ -61,22 +60,6 @@ unsigned char* target() {
 unsigned char* copyOfTarget() {
     static const Buffer buffer(size_t{UHD.width} * UHD.height * 8);
     return buffer.start();
-}
-
-using Work = std::function<void()>;
-
-void addRow(const std::string& name, size_t bytes, const Work& work) {
-    benchmark::RegisterBenchmark(name.c_str(),
-                                 [work, bytes](benchmark::State& state) {
-                                     for ([[maybe_unused]] auto _ : state) {
-                                         work();
-                                         benchmark::ClobberMemory();
-                                     }
-                                     state.SetBytesProcessed(
-                                         static_cast<int64_t>(state.iterations() * bytes));
-                                 })
-        ->UseRealTime()
-        ->Unit(benchmark::kMicrosecond);
 }
 
 /// Lines of a buffer that a filler writes.
