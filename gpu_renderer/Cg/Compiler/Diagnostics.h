@@ -63,7 +63,7 @@ private:
 
 /// A piece of the source as messages quote it: in single quotes, cut where it is long, bytes that do not
 /// print as `\x8f`.
-std::string quoted(std::string_view text);
+std::string inQuotes(std::string_view text);
 
 } // namespace cg
 

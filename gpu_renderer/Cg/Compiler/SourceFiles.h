@@ -9,6 +9,7 @@
 #include <optional>
 #include <string>
 #include <string_view>
+#include <unordered_map>
 #include <vector>
 
 namespace cg {
@@ -30,7 +31,7 @@ public:
     /// The whole text; a view into it lives as long as this object.
     std::string_view text(std::uint32_t file) const { return mFiles[file].text; }
 
-    /// One line without its line end; empty for a line that the file has not.
+    /// One line without its line end; empty for a line that the file has not. Searches from the file's start.
     /// @param line  from 1, counted in the file itself
     std::string_view line(std::uint32_t file, std::uint32_t line) const;
 
@@ -60,11 +61,11 @@ private:
     struct File {
         std::string name;
         std::string text;
-        std::vector<std::size_t> lineStarts;   ///< built by the first line()
         std::vector<Renumbering> renumberings; ///< by line
     };
 
     std::deque<File> mFiles; ///< a deque: texts stay where they are
+    std::unordered_map<std::string_view, std::uint32_t> mIndexByName;
     Arena mSpellings;
 };
 
