@@ -11,8 +11,7 @@ namespace cg {
 ///
 /// Whole numbers are decimal, hexadecimal (`0x1F`) or octal (`017`), and take `u` and `l`; numbers with a
 /// point or an exponent may lack the digits before or after the point. Each takes one of `f` (float), `h`
-/// (half), `x` (fixed) and `d` (double, a float here), which make a float of a whole number as well. Capitals
-/// are the same.
+/// (half) and `x` (fixed), which make a float of a whole number as well. Capitals are the same.
 struct NumberSpelling {
     enum class Kind { INTEGER, UNSIGNED, FLOAT, HALF, FIXED, INVALID };
 

@@ -1,0 +1,46 @@
+#ifndef CG_COMPILER_NAME_SCOPES_H
+#define CG_COMPILER_NAME_SCOPES_H
+
+#include <cstddef>
+#include <string_view>
+#include <unordered_map>
+#include <vector>
+
+namespace cg {
+
+/// Which names are types, at the place that the parser has reached. The grammar depends on nothing else: any
+/// name that the program declares as a variable or a function is that, even `texture` or `vec2`.
+class NameScopes {
+public:
+    /// Opens a scope for as long as it lives.
+    class Scope {
+    public:
+        explicit Scope(NameScopes& scopes) : mScopes(scopes), mStart(scopes.mDeclared.size()) {}
+        ~Scope() { mScopes.forgetFrom(mStart); }
+        Scope(const Scope&) = delete;
+        Scope& operator=(const Scope&) = delete;
+
+    private:
+        NameScopes& mScopes;
+        std::size_t mStart;
+    };
+
+    void declareType(std::string_view name) { declare(name, true); }
+    void declareOther(std::string_view name) { declare(name, false); } ///< a variable or a function
+
+    /// Declared by the program, or a type that the language has.
+    bool isType(std::string_view name) const;
+
+    bool isVariableOrFunction(std::string_view name) const;
+
+private:
+    void declare(std::string_view name, bool isType);
+    void forgetFrom(std::size_t start);
+
+    std::unordered_map<std::string_view, std::vector<bool>> mMeanings; ///< true for a type, innermost last
+    std::vector<std::string_view> mDeclared;                           ///< in their order
+};
+
+} // namespace cg
+
+#endif
