@@ -2,6 +2,9 @@
 
 #include <gtest/gtest.h>
 
+#include <sys/mman.h>
+
+#include <algorithm>
 #include <array>
 #include <cstdint>
 #include <cstring>
@@ -176,6 +179,93 @@ TEST_P(PatternFillers, RowsLongerThanAPieceEqualTheWalkOverPixels) {
     expectPackedFill(p, Image::COL_ARGB, true, 0);
     for (const uint32_t bytes : {1U, 2U, 4U})
         expectPlanarFill(p, bytes / 2, bytes, 0);
+}
+
+/// Address space for a picture whose indices wrap, with memory at both ends only.
+class WrappedBuffer {
+public:
+    explicit WrappedBuffer(size_t bytes)
+        : mBytes(bytes),
+          mStart(static_cast<unsigned char*>(
+              mmap(nullptr, bytes, PROT_NONE, MAP_PRIVATE | MAP_ANONYMOUS | MAP_NORESERVE, -1, 0))) {
+        EXPECT_NE(mStart, MAP_FAILED);
+        EXPECT_EQ(mprotect(mStart, END, PROT_READ | PROT_WRITE), 0);
+        EXPECT_EQ(mprotect(mStart + mBytes - END, END, PROT_READ | PROT_WRITE), 0);
+    }
+    WrappedBuffer(const WrappedBuffer&) = delete;
+    WrappedBuffer& operator=(const WrappedBuffer&) = delete;
+    ~WrappedBuffer() { munmap(mStart, mBytes); }
+    unsigned char* start() const { return mStart; }
+    bool operator==(const WrappedBuffer& other) const {
+        return std::memcmp(mStart, other.mStart, END) == 0 &&
+               std::memcmp(mStart + mBytes - END, other.mStart + mBytes - END, END) == 0;
+    }
+
+private:
+    static constexpr size_t END = 65536;
+    size_t mBytes;
+    unsigned char* mStart;
+};
+
+TEST(Fillers, IndicesWrapAt32Bits) {
+    constexpr size_t INDICES = size_t{1} << 32;
+    for (const uint32_t pattern : {Image::H_RAMP, Image::V_RAMP}) {
+        const uint32_t pitch = (1U << 30) - 10; // line 1 starts ten pixels before the last index
+        const Picture packed = {pattern, 40, 2, pitch, 2, 0, 0, 40, 2};
+        for (const bool isHalf : {false, true}) {
+            const WrappedBuffer expected(INDICES * (isHalf ? 2 : 1));
+            const WrappedBuffer filled(INDICES * (isHalf ? 2 : 1));
+            fillSlowly(expected.start(), packed, Image::COL_RGBA, isHalf);
+            Image::fillTestPattern(filled.start(), Image::COL_RGBA, 40, 2, pitch, pattern, 2, 0, 0, 40, 2,
+                                   isHalf);
+            EXPECT_TRUE(filled == expected) << pattern << ' ' << isHalf;
+        }
+        const Picture plane = {pattern, 40, 2, 0U - 10, 2, 0, 0, 40, 2};
+        const WrappedBuffer expected(INDICES);
+        const WrappedBuffer filled(INDICES);
+        fillPlaneSlowly(expected.start(), plane, 0, 1);
+        Image::fillTestPatternPlanar(filled.start(), 40, 2, 0U - 10, pattern, 2, 0, 1, 0, 0, 40, 2);
+        EXPECT_TRUE(filled == expected) << pattern;
+    }
+}
+
+TEST(Fillers, RegionsThatPassTheLastIndexAreEmpty) {
+    unsigned char byte = 7;
+    Image::fillTestPattern(&byte, Image::COL_RGBA, 8, 8, 8, Image::H_RAMP, 2, 8, 0, 0xFFFFFFFF, 1, false);
+    Image::fillTestPatternPlanar(&byte, 8, 8, 8, Image::V_RAMP, 2, 0, 1, 0, 8, 1, 0xFFFFFFFF);
+    EXPECT_EQ(byte, 7);
+}
+
+TEST(Fillers, FlatColoursFillTheirRowsAndNothingElse) {
+    RandomPictures random(0);
+    for (int i = 0; i < 200; ++i) {
+        const uint32_t width = random.upTo(i % 10 == 0 ? 3000 : 90);
+        const uint32_t height = random.upTo(7);
+        const uint32_t pitch = width + random.upTo(9);
+        const uint32_t bytes = std::array{1U, 2U, 3U, 4U}[random.upTo(3)];
+        const size_t misalignment = random.upTo(15);
+        uint32_t colour[] = {0x11223344, 0x5566, 0x77, 0xFFFFFFFF};
+        GuardedBuffer packed(size_t{pitch} * height * 4, misalignment);
+        GuardedBuffer plane = packed;
+        GuardedBuffer expectedPacked = packed;
+        GuardedBuffer expectedPlane = packed;
+        for (uint32_t x = 0; x < width; ++x)
+            for (uint32_t y = 0; y < height; ++y) {
+                for (uint32_t c = 0; c < 4; ++c)
+                    store<uint8_t>(expectedPacked.start(), (y * pitch + x) * 4 + c, colour[c]);
+                if (bytes == 1)
+                    store<uint8_t>(expectedPlane.start(), x + y * pitch, colour[0]);
+                else if (bytes == 2)
+                    store<uint16_t>(expectedPlane.start(), x + y * pitch, colour[0]);
+                else if (bytes == 4)
+                    store<uint32_t>(expectedPlane.start(), x + y * pitch, colour[0]);
+            }
+        Image::fillColour(packed.start(), width, height, pitch, colour);
+        Image::fillColourPlanar(plane.start(), width, height, pitch, bytes, colour[0]);
+        ASSERT_EQ(packed.differenceFrom(expectedPacked), "") << width << 'x' << height;
+        ASSERT_EQ(plane.differenceFrom(expectedPlane), "")
+            << width << 'x' << height << " of " << bytes << " bytes";
+    }
 }
 
 INSTANTIATE_TEST_SUITE_P(EveryPattern, PatternFillers, testing::Range(0U, 23U));
