@@ -1,0 +1,574 @@
+#include <Cg/Compiler/BuiltinFunctions.h>
+
+#include <cctype>
+#include <unordered_map>
+
+namespace cg {
+
+namespace {
+
+/// A row as it is written: "result(parameters)". Shared by all operands of a row are one size (1 to 4) and
+/// one scalar kind, the highest of the arguments':
+///   N number, F floating, I integer, B boolean, each of the shared size; n, f, i, b the same as one scalar;
+///   F2, I3, ... of a fixed size; 2, 3, 4 and 1: float vectors, whatever the other operands are;
+///   M a matrix, T its transposed, Q a square one; s1 s2 s3 sR sC samplers, z1 z2 zR those of depths;
+///   t a text, v nothing; o before a parameter: out.
+struct Row {
+    const char* name;
+    const char* signature;
+    const char* form;
+    const char* helper = "";
+};
+
+constexpr Row CG_ROWS[] = {
+    // Arithmetic, component by component.
+    {"abs", "N(N)", "abs($0)"},
+    {"ceil", "F(F)", "ceil($0)"},
+    {"clamp", "N(N,N,N)", "clamp($0, $1, $2)"},
+    {"exp", "F(F)", "exp($0)"},
+    {"exp2", "F(F)", "exp2($0)"},
+    {"floor", "F(F)", "floor($0)"},
+    {"fmod", "F(F,F)", "cg_fmod($0, $1)", "cg_fmod"},
+    {"frac", "F(F)", "fract($0)"},
+    {"frexp", "F(F,oF)", "cg_frexp($0, $1)", "cg_frexp"},
+    {"ldexp", "F(F,F)", "cg_ldexp($0, $1)", "cg_ldexp"},
+    {"lerp", "F(F,F,f)", "mix($0, $1, $2)"},
+    {"lerp", "F(F,F,F)", "mix($0, $1, $2)"},
+    {"log", "F(F)", "log($0)"},
+    {"log10", "F(F)", "cg_log10($0)", "cg_log10"},
+    {"log2", "F(F)", "log2($0)"},
+    {"mad", "F(F,F,F)", "cg_mad($0, $1, $2)", "cg_mad"},
+    {"max", "N(N,N)", "max($0, $1)"},
+    {"min", "N(N,N)", "min($0, $1)"},
+    {"modf", "F(F,oF)", "modf($0, $1)"},
+    {"pow", "F(F,F)", "pow($0, $1)"},
+    {"rcp", "F(F)", "cg_rcp($0)", "cg_rcp"},
+    {"round", "F(F)", "roundEven($0)"},
+    {"rsqrt", "F(F)", "inversesqrt($0)"},
+    {"saturate", "F(F)", "clamp($0, 0.0, 1.0)"},
+    {"sign", "N(N)", "sign($0)"},
+    {"smoothstep", "F(F,F,F)", "smoothstep($0, $1, $2)"},
+    {"sqrt", "F(F)", "sqrt($0)"},
+    {"step", "F(F,F)", "step($0, $1)"},
+    {"trunc", "F(F)", "trunc($0)"},
+
+    // Angles.
+    {"acos", "F(F)", "acos($0)"},
+    {"asin", "F(F)", "asin($0)"},
+    {"atan", "F(F)", "atan($0)"},
+    {"atan2", "F(F,F)", "atan($0, $1)"},
+    {"cos", "F(F)", "cos($0)"},
+    {"cosh", "F(F)", "cosh($0)"},
+    {"degrees", "F(F)", "degrees($0)"},
+    {"radians", "F(F)", "radians($0)"},
+    {"sin", "F(F)", "sin($0)"},
+    {"sincos", "v(F,oF,oF)", "cg_sincos($0, $1, $2)", "cg_sincos"},
+    {"sinh", "F(F)", "sinh($0)"},
+    {"tan", "F(F)", "tan($0)"},
+    {"tanh", "F(F)", "tanh($0)"},
+
+    // Vectors and matrices; mul() has rules of its own.
+    {"cross", "F3(F3,F3)", "cross($0, $1)"},
+    {"determinant", "f(Q)", "determinant($0)"},
+    {"determinant", "f(f)", "$0"},
+    {"distance", "f(F,F)", "distance($0, $1)"},
+    {"dot", "f(F,F)", "dot($0, $1)"},
+    {"dst", "F4(F4,F4)", "cg_dst($0, $1)", "cg_dst"},
+    {"faceforward", "F(F,F,F)", "faceforward($0, $1, $2)"},
+    {"inverse", "Q(Q)", "inverse($0)"},
+    {"length", "f(F)", "length($0)"},
+    {"lit", "F4(f,f,f)", "cg_lit($0, $1, $2)", "cg_lit"},
+    {"normalize", "F(F)", "normalize($0)"},
+    {"reflect", "F(F,F)", "reflect($0, $1)"},
+    {"refract", "F(F,F,f)", "refract($0, $1, $2)"},
+    {"transpose", "T(M)", "transpose($0)"},
+
+    // Questions.
+    {"all", "b(b)", "$0"},
+    {"all", "b(B)", "all($0)"},
+    {"any", "b(b)", "$0"},
+    {"any", "b(B)", "any($0)"},
+    {"isfinite", "B(F)", "cg_isfinite($0)", "cg_isfinite"},
+    {"isinf", "B(F)", "isinf($0)"},
+    {"isnan", "B(F)", "isnan($0)"},
+
+    // Bits.
+    {"asfloat", "F(I)", "intBitsToFloat($0)"},
+    {"asint", "I(F)", "floatBitsToInt($0)"},
+    {"bitCount", "I(I)", "cg_bitCount($0)", "cg_bitCount"},
+    {"bitfieldExtract", "I(I,i,i)", "cg_bitfieldExtract($0, $1, $2)", "cg_bitfieldExtract"},
+    {"bitfieldInsert", "I(I,I,i,i)", "cg_bitfieldInsert($0, $1, $2, $3)", "cg_bitfieldInsert"},
+    {"bitfieldReverse", "I(I)", "cg_bitfieldReverse($0)", "cg_bitfieldReverse"},
+    {"findLSB", "I(I)", "cg_findLSB($0)", "cg_findLSB"},
+    {"findMSB", "I(I)", "cg_findMSB($0)", "cg_findMSB"},
+    {"floatToIntBits", "I(F)", "floatBitsToInt($0)"},
+    {"floatToRawIntBits", "I(F)", "floatBitsToInt($0)"},
+    {"intBitsToFloat", "F(I)", "intBitsToFloat($0)"},
+    {"pack_2half", "1(2)", "cg_pack_2half($0)", "cg_pack_2half"},
+    {"pack_2ushort", "1(2)", "cg_pack_2ushort($0)", "cg_pack_2ushort"},
+    {"pack_4byte", "1(4)", "cg_pack_4byte($0)", "cg_pack_4byte"},
+    {"pack_4ubyte", "1(4)", "cg_pack_4ubyte($0)", "cg_pack_4ubyte"},
+    {"unpack_2half", "2(1)", "cg_unpack_2half($0)", "cg_unpack_2half"},
+    {"unpack_2ushort", "2(1)", "cg_unpack_2ushort($0)", "cg_unpack_2ushort"},
+    {"unpack_4byte", "4(1)", "cg_unpack_4byte($0)", "cg_unpack_4byte"},
+    {"unpack_4ubyte", "4(1)", "cg_unpack_4ubyte($0)", "cg_unpack_4ubyte"},
+
+    // Fragments.
+    {"clip", "v(F)", "cg_clip($0)", "cg_clip"},
+    {"ddx", "F(F)", "dFdx($0)"},
+    {"ddy", "F(F)", "dFdy($0)"},
+    {"fwidth", "F(F)", "fwidth($0)"},
+    {"debug", "v(4)", "cg_debug($0)", "cg_debug"},
+
+    // Look-ups, 1D. The unused third coordinate of a depth look-up stands between the others in GLSL.
+    {"tex1D", "4(s1,1)", "texture($0, $1)"},
+    {"tex1D", "4(s1,1,i)", "textureOffset($0, $1, $2)"},
+    {"tex1D", "4(s1,1,1,1)", "textureGrad($0, $1, $2, $3)"},
+    {"tex1D", "4(s1,1,1,1,i)", "textureGradOffset($0, $1, $2, $3, $4)"},
+    {"tex1D", "4(z1,2)", "cg_depth(texture($0, vec3($1.x, 0.0, $1.y)))", "cg_depth"},
+    {"tex1D", "4(z1,2,1,1)", "cg_depth(textureGrad($0, vec3($1.x, 0.0, $1.y), $2, $3))", "cg_depth"},
+    {"tex1Dbias", "4(s1,4)", "texture($0, $1.x, $1.w)"},
+    {"tex1Dbias", "4(s1,4,i)", "textureOffset($0, $1.x, $2, $1.w)"},
+    {"tex1Dlod", "4(s1,4)", "textureLod($0, $1.x, $1.w)"},
+    {"tex1Dlod", "4(s1,4,i)", "textureLodOffset($0, $1.x, $1.w, $2)"},
+    {"tex1Dproj", "4(s1,1)", "texture($0, $1)"},
+    {"tex1Dproj", "4(s1,2)", "textureProj($0, $1)"},
+    {"tex1Dproj", "4(s1,2,i)", "textureProjOffset($0, $1, $2)"},
+    {"tex1Dproj", "4(z1,3)", "cg_depth(textureProj($0, vec4($1.x, 0.0, $1.yz)))", "cg_depth"},
+    {"tex1Dproj", "4(s1,4)", "textureProj($0, $1)"},
+    {"tex1Dfetch", "4(s1,I4)", "texelFetch($0, $1.x, $1.w)"},
+    {"tex1Dfetch", "4(s1,I4,i)", "texelFetchOffset($0, $1.x, $1.w, $2)"},
+    {"tex1Dsize", "I3(s1,i)", "ivec3(textureSize($0, $1), 0, 0)"},
+
+    // 2D.
+    {"tex2D", "4(s2,2)", "texture($0, $1)"},
+    {"tex2D", "4(z2,3)", "cg_depth(texture($0, $1))", "cg_depth"},
+    {"tex2D", "4(s2,2,I2)", "textureOffset($0, $1, $2)"},
+    {"tex2D", "4(z2,3,I2)", "cg_depth(textureOffset($0, $1, $2))", "cg_depth"},
+    {"tex2D", "4(s2,2,2,2)", "textureGrad($0, $1, $2, $3)"},
+    {"tex2D", "4(z2,3,2,2)", "cg_depth(textureGrad($0, $1, $2, $3))", "cg_depth"},
+    {"tex2D", "4(s2,2,2,2,I2)", "textureGradOffset($0, $1, $2, $3, $4)"},
+    {"tex2D", "4(z2,3,2,2,I2)", "cg_depth(textureGradOffset($0, $1, $2, $3, $4))", "cg_depth"},
+    {"tex2Dbias", "4(s2,4)", "texture($0, $1.xy, $1.w)"},
+    {"tex2Dbias", "4(s2,4,I2)", "textureOffset($0, $1.xy, $2, $1.w)"},
+    {"tex2Dlod", "4(s2,4)", "textureLod($0, $1.xy, $1.w)"},
+    {"tex2Dlod", "4(s2,4,I2)", "textureLodOffset($0, $1.xy, $1.w, $2)"},
+    {"tex2Dgrad", "4(s2,2,2,2)", "textureGrad($0, $1, $2, $3)"},
+    {"tex2Dproj", "4(s2,2)", "texture($0, $1)"},
+    {"tex2Dproj", "4(s2,3)", "textureProj($0, $1)"},
+    {"tex2Dproj", "4(s2,3,I2)", "textureProjOffset($0, $1, $2)"},
+    {"tex2Dproj", "4(z2,4)", "cg_depth(textureProj($0, $1))", "cg_depth"},
+    {"tex2Dproj", "4(s2,4)", "textureProj($0, $1)"},
+    {"tex2Dproj", "4(s2,4,I2)", "textureProjOffset($0, $1, $2)"},
+    {"tex2Dfetch", "4(s2,I4)", "texelFetch($0, $1.xy, $1.w)"},
+    {"tex2Dfetch", "4(s2,I4,I2)", "texelFetchOffset($0, $1.xy, $1.w, $2)"},
+    {"tex2Dsize", "I3(s2,i)", "ivec3(textureSize($0, $1), 0)"},
+
+    // RECT: pixel coordinates, no mip levels.
+    {"texRECT", "4(sR,2)", "texture($0, $1)"},
+    {"texRECT", "4(zR,3)", "cg_depth(texture($0, $1))", "cg_depth"},
+    {"texRECT", "4(sR,2,I2)", "textureOffset($0, $1, $2)"},
+    {"texRECT", "4(sR,2,2,2)", "textureGrad($0, $1, $2, $3)"},
+    {"texRECT", "4(zR,3,2,2)", "cg_depth(textureGrad($0, $1, $2, $3))", "cg_depth"},
+    {"texRECT", "4(sR,2,2,2,I2)", "textureGradOffset($0, $1, $2, $3, $4)"},
+    {"texRECTbias", "4(sR,4)", "texture($0, $1.xy)"},
+    {"texRECTbias", "4(sR,4,I2)", "textureOffset($0, $1.xy, $2)"},
+    {"texRECTlod", "4(sR,4)", "texture($0, $1.xy)"},
+    {"texRECTlod", "4(sR,4,I2)", "textureOffset($0, $1.xy, $2)"},
+    {"texRECTproj", "4(sR,2)", "texture($0, $1)"},
+    {"texRECTproj", "4(sR,3)", "textureProj($0, $1)"},
+    {"texRECTproj", "4(sR,3,I2)", "textureProjOffset($0, $1, $2)"},
+    {"texRECTproj", "4(zR,4)", "cg_depth(textureProj($0, $1))", "cg_depth"},
+    {"texRECTproj", "4(sR,4)", "textureProj($0, $1)"},
+    {"texRECTproj", "4(sR,4,I2)", "textureProjOffset($0, $1, $2)"},
+    {"texRECTfetch", "4(sR,I4)", "texelFetch($0, $1.xy)"},
+    {"texRECTfetch", "4(sR,I4,I2)", "texelFetchOffset($0, $1.xy, $2)"},
+    {"texRECTsize", "I3(sR,i)", "ivec3(textureSize($0), 0)"},
+    {"texRECTsize", "I3(sR)", "ivec3(textureSize($0), 0)"},
+
+    // 3D.
+    {"tex3D", "4(s3,3)", "texture($0, $1)"},
+    {"tex3D", "4(s3,3,I3)", "textureOffset($0, $1, $2)"},
+    {"tex3D", "4(s3,3,3,3)", "textureGrad($0, $1, $2, $3)"},
+    {"tex3D", "4(s3,3,3,3,I3)", "textureGradOffset($0, $1, $2, $3, $4)"},
+    {"tex3Dbias", "4(s3,4)", "texture($0, $1.xyz, $1.w)"},
+    {"tex3Dbias", "4(s3,4,I3)", "textureOffset($0, $1.xyz, $2, $1.w)"},
+    {"tex3Dlod", "4(s3,4)", "textureLod($0, $1.xyz, $1.w)"},
+    {"tex3Dlod", "4(s3,4,I3)", "textureLodOffset($0, $1.xyz, $1.w, $2)"},
+    {"tex3Dproj", "4(s3,3)", "texture($0, $1)"},
+    {"tex3Dproj", "4(s3,4)", "textureProj($0, $1)"},
+    {"tex3Dproj", "4(s3,4,I3)", "textureProjOffset($0, $1, $2)"},
+    {"tex3Dfetch", "4(s3,I4)", "texelFetch($0, $1.xyz, $1.w)"},
+    {"tex3Dfetch", "4(s3,I4,I3)", "texelFetchOffset($0, $1.xyz, $1.w, $2)"},
+    {"tex3Dsize", "I3(s3,i)", "textureSize($0, $1)"},
+
+    // CUBE: a direction, so a projection changes nothing.
+    {"texCUBE", "4(sC,3)", "texture($0, $1)"},
+    {"texCUBE", "4(sC,3,3,3)", "textureGrad($0, $1, $2, $3)"},
+    {"texCUBEbias", "4(sC,4)", "texture($0, $1.xyz, $1.w)"},
+    {"texCUBElod", "4(sC,4)", "textureLod($0, $1.xyz, $1.w)"},
+    {"texCUBEproj", "4(sC,3)", "texture($0, $1)"},
+    {"texCUBEproj", "4(sC,4)", "texture($0, $1.xyz)"},
+    {"texCUBEsize", "I3(sC,i)", "ivec3(textureSize($0, $1), 0)"},
+};
+
+/// GLSL's names, which many programs use in Cg.
+constexpr Row GLSL_ROWS[] = {
+    {"dFdx", "F(F)", "dFdx($0)"},
+    {"dFdy", "F(F)", "dFdy($0)"},
+    {"fract", "F(F)", "fract($0)"},
+    {"inversesqrt", "F(F)", "inversesqrt($0)"},
+    {"mix", "F(F,F,f)", "mix($0, $1, $2)"},
+    {"mix", "F(F,F,F)", "mix($0, $1, $2)"},
+    {"mod", "F(F,f)", "mod($0, $1)"},
+    {"mod", "F(F,F)", "mod($0, $1)"},
+    {"atan", "F(F,F)", "atan($0, $1)"},
+    {"roundEven", "F(F)", "roundEven($0)"},
+    {"equal", "B(N,N)", "equal($0, $1)"},
+    {"notEqual", "B(N,N)", "notEqual($0, $1)"},
+    {"lessThan", "B(N,N)", "lessThan($0, $1)"},
+    {"lessThanEqual", "B(N,N)", "lessThanEqual($0, $1)"},
+    {"greaterThan", "B(N,N)", "greaterThan($0, $1)"},
+    {"greaterThanEqual", "B(N,N)", "greaterThanEqual($0, $1)"},
+    {"texture1D", "4(s1,1)", "texture($0, $1)"},
+    {"texture2D", "4(s2,2)", "texture($0, $1)"},
+    {"texture2D", "4(s2,2,1)", "texture($0, $1, $2)"},
+    {"texture2DLod", "4(s2,2,1)", "textureLod($0, $1, $2)"},
+    {"texture2DProj", "4(s2,3)", "textureProj($0, $1)"},
+    {"texture2DProj", "4(s2,4)", "textureProj($0, $1)"},
+    {"texture2DRect", "4(sR,2)", "texture($0, $1)"},
+    {"texture3D", "4(s3,3)", "texture($0, $1)"},
+    {"textureCube", "4(sC,3)", "texture($0, $1)"},
+};
+
+struct Helper {
+    const char* name;
+    const char* text;
+    const char* needs = "";
+};
+
+/// Helper functions. One that names T exists once for each type T that it is called with: B is the same of
+/// bools, N its number of components. A name with a 1 behind it is the one for scalars.
+constexpr Helper HELPERS[] = {
+    {"cg_fmod", "T cg_fmod(T x, T y) { return x - y * trunc(x / y); }"},
+    {"cg_ldexp", "T cg_ldexp(T x, T exponent) { return x * exp2(exponent); }"},
+    {"cg_log10", "T cg_log10(T x) { return log2(x) * 0.301029996; }"},
+    {"cg_mad", "T cg_mad(T a, T b, T c) { return a * b + c; }"},
+    {"cg_rcp", "T cg_rcp(T x) { return 1.0 / x; }"},
+    {"cg_sincos", "void cg_sincos(T x, out T s, out T c) {\n    s = sin(x);\n    c = cos(x);\n}"},
+    {"cg_isfinite", "B cg_isfinite(T x) { return lessThan(abs(x), T(3.4028235e38)); }"},
+    {"cg_isfinite1", "bool cg_isfinite(float x) { return abs(x) <= 3.4028235e38; }"},
+    {"cg_frexp1", "float cg_frexp(float x, out float exponent) {\n"
+                  "    exponent = 0.0;\n"
+                  "    if (x == 0.0)\n"
+                  "        return 0.0;\n"
+                  "    int bits = floatBitsToInt(x);\n"
+                  "    exponent = float(((bits >> 23) & 255) - 126);\n"
+                  "    return intBitsToFloat((bits & ~0x7F800000) | 0x3F000000);\n"
+                  "}"},
+    {"cg_frexp",
+     "T cg_frexp(T x, out T exponent) {\n"
+     "    for (int i = 0; i < N; ++i) {\n"
+     "        float e;\n"
+     "        x[i] = cg_frexp(x[i], e);\n"
+     "        exponent[i] = e;\n"
+     "    }\n"
+     "    return x;\n"
+     "}",
+     "cg_frexp1"},
+    {"cg_dst", "vec4 cg_dst(vec4 a, vec4 b) { return vec4(1.0, a.y * b.y, a.z, b.w); }"},
+    {"cg_lit", "vec4 cg_lit(float diffuse, float specular, float shininess) {\n"
+               "    float highlight = diffuse > 0.0 ? pow(max(0.0, specular), shininess) : 0.0;\n"
+               "    return vec4(1.0, max(0.0, diffuse), highlight, 1.0);\n"
+               "}"},
+    {"cg_clip1", "void cg_clip(float x) {\n    if (x < 0.0)\n        discard;\n}"},
+    {"cg_clip", "void cg_clip(T x) {\n    if (any(lessThan(x, T(0.0))))\n        discard;\n}"},
+    {"cg_debug", "void cg_debug(vec4 colour) {}"},
+    {"cg_depth", "vec4 cg_depth(float lit) { return vec4(lit, lit, lit, 1.0); }"},
+    {"cg_select", "T cg_select(B condition, T a, T b) {\n"
+                  "    for (int i = 0; i < N; ++i)\n"
+                  "        if (condition[i])\n"
+                  "            b[i] = a[i];\n"
+                  "    return b;\n"
+                  "}"},
+    {"cg_and",
+     "T cg_and(T a, T b) {\n    for (int i = 0; i < N; ++i)\n        a[i] = a[i] && b[i];\n    return a;\n}"},
+    {"cg_or",
+     "T cg_or(T a, T b) {\n    for (int i = 0; i < N; ++i)\n        a[i] = a[i] || b[i];\n    return a;\n}"},
+    {"cg_bitCount", "T cg_bitCount(T x) {\n"
+                    "    T count = T(0);\n"
+                    "    for (int bit = 0; bit < 32; ++bit)\n"
+                    "        count += (x >> bit) & 1;\n"
+                    "    return count;\n"
+                    "}"},
+    {"cg_bitfieldExtract", "T cg_bitfieldExtract(T x, int offset, int bits) {\n"
+                           "    if (bits == 0)\n        return T(0);\n"
+                           "    return (x << (32 - bits - offset)) >> (32 - bits);\n"
+                           "}"},
+    {"cg_bitfieldInsert", "T cg_bitfieldInsert(T base, T insert, int offset, int bits) {\n"
+                          "    int mask = (bits == 32 ? ~0 : (1 << bits) - 1) << offset;\n"
+                          "    return (base & ~mask) | ((insert << offset) & mask);\n"
+                          "}"},
+    {"cg_bitfieldReverse", "T cg_bitfieldReverse(T x) {\n"
+                           "    T r = T(0);\n"
+                           "    for (int bit = 0; bit < 32; ++bit)\n"
+                           "        r |= ((x >> bit) & 1) << (31 - bit);\n"
+                           "    return r;\n"
+                           "}"},
+    {"cg_findLSB1", "int cg_findLSB(int x) {\n"
+                    "    for (int bit = 0; bit < 32; ++bit)\n"
+                    "        if (((x >> bit) & 1) != 0)\n"
+                    "            return bit;\n"
+                    "    return -1;\n"
+                    "}"},
+    {"cg_findMSB1", "int cg_findMSB(int x) {\n"
+                    "    int y = x < 0 ? ~x : x;\n"
+                    "    for (int bit = 30; bit >= 0; --bit)\n"
+                    "        if (((y >> bit) & 1) != 0)\n"
+                    "            return bit;\n"
+                    "    return -1;\n"
+                    "}"},
+    {"cg_findLSB",
+     "T cg_findLSB(T x) {\n    for (int i = 0; i < N; ++i)\n        x[i] = cg_findLSB(x[i]);\n    return "
+     "x;\n}",
+     "cg_findLSB1"},
+    {"cg_findMSB",
+     "T cg_findMSB(T x) {\n    for (int i = 0; i < N; ++i)\n        x[i] = cg_findMSB(x[i]);\n    return "
+     "x;\n}",
+     "cg_findMSB1"},
+    {"cg_half_bits", "uint cg_half_bits(float x) {\n"
+                     "    uint bits = floatBitsToUint(x);\n"
+                     "    uint sign = (bits >> 16) & 0x8000u;\n"
+                     "    uint magnitude = bits & 0x7FFFFFFFu;\n"
+                     "    if (magnitude >= 0x47800000u)\n"
+                     "        return sign | (magnitude > 0x7F800000u ? 0x7E00u : 0x7C00u);\n"
+                     "    if (magnitude < 0x38800000u)\n"
+                     "        return sign | uint(roundEven(abs(x) * 16777216.0));\n"
+                     "    uint rounded = magnitude + 0xFFFu + ((magnitude >> 13) & 1u);\n"
+                     "    return sign | ((rounded - 0x38000000u) >> 13);\n"
+                     "}"},
+    {"cg_half_value", "float cg_half_value(uint bits) {\n"
+                      "    uint exponent = (bits >> 10) & 31u;\n"
+                      "    float sign = (bits & 0x8000u) != 0u ? -1.0 : 1.0;\n"
+                      "    if (exponent == 0u)\n"
+                      "        return sign * float(bits & 0x3FFu) / 16777216.0;\n"
+                      "    uint magnitude = exponent == 31u ? 0x7F800000u : (exponent + 112u) << 23;\n"
+                      "    return sign * uintBitsToFloat(magnitude | ((bits & 0x3FFu) << 13));\n"
+                      "}"},
+    {"cg_pack_2half",
+     "float cg_pack_2half(vec2 a) { return uintBitsToFloat(cg_half_bits(a.x) | (cg_half_bits(a.y) << 16)); }",
+     "cg_half_bits"},
+    {"cg_unpack_2half",
+     "vec2 cg_unpack_2half(float a) {\n"
+     "    uint bits = floatBitsToUint(a);\n"
+     "    return vec2(cg_half_value(bits & 0xFFFFu), cg_half_value(bits >> 16));\n"
+     "}",
+     "cg_half_value"},
+    {"cg_pack_2ushort", "float cg_pack_2ushort(vec2 a) {\n"
+                        "    uvec2 u = uvec2(roundEven(clamp(a, 0.0, 1.0) * 65535.0));\n"
+                        "    return uintBitsToFloat(u.x | (u.y << 16));\n"
+                        "}"},
+    {"cg_unpack_2ushort", "vec2 cg_unpack_2ushort(float a) {\n"
+                          "    uint bits = floatBitsToUint(a);\n"
+                          "    return vec2(float(bits & 0xFFFFu), float(bits >> 16)) / 65535.0;\n"
+                          "}"},
+    {"cg_pack_4byte", "float cg_pack_4byte(vec4 a) {\n"
+                      "    uvec4 u = uvec4(roundEven(clamp(a, -128.0 / 127.0, 1.0) * 127.0 + 128.0));\n"
+                      "    return uintBitsToFloat(u.x | (u.y << 8) | (u.z << 16) | (u.w << 24));\n"
+                      "}"},
+    {"cg_unpack_4byte", "vec4 cg_unpack_4byte(float a) {\n"
+                        "    uvec4 u = (uvec4(floatBitsToUint(a)) >> uvec4(0, 8, 16, 24)) & 0xFFu;\n"
+                        "    return (vec4(u) - 128.0) / 127.0;\n"
+                        "}"},
+    {"cg_pack_4ubyte", "float cg_pack_4ubyte(vec4 a) {\n"
+                       "    uvec4 u = uvec4(roundEven(clamp(a, 0.0, 1.0) * 255.0));\n"
+                       "    return uintBitsToFloat(u.x | (u.y << 8) | (u.z << 16) | (u.w << 24));\n"
+                       "}"},
+    {"cg_unpack_4ubyte", "vec4 cg_unpack_4ubyte(float a) {\n"
+                         "    uvec4 u = (uvec4(floatBitsToUint(a)) >> uvec4(0, 8, 16, 24)) & 0xFFu;\n"
+                         "    return vec4(u) / 255.0;\n"
+                         "}"},
+};
+
+BuiltinOperand samplerOperand(char dimension, bool isDepth) {
+    BuiltinOperand operand;
+    operand.kind = BuiltinOperand::Kind::SAMPLER;
+    switch (dimension) {
+    case '1':
+        operand.sampler = isDepth ? Sampler::D1_SHADOW : Sampler::D1;
+        break;
+    case '2':
+        operand.sampler = isDepth ? Sampler::D2_SHADOW : Sampler::D2;
+        break;
+    case '3':
+        operand.sampler = Sampler::D3;
+        break;
+    case 'R':
+        operand.sampler = isDepth ? Sampler::RECT_SHADOW : Sampler::RECT;
+        break;
+    default:
+        operand.sampler = Sampler::CUBE;
+        break;
+    }
+    return operand;
+}
+
+/// Reads one operand of a signature and moves on behind it.
+BuiltinOperand readOperand(const char*& at) {
+    using Kind = BuiltinOperand::Kind;
+    BuiltinOperand operand;
+    operand.isOut = *at == 'o';
+    if (operand.isOut)
+        ++at;
+    const char letter = *at++;
+    if (letter == 's' || letter == 'z')
+        return samplerOperand(*at++, letter == 'z');
+    switch (letter) {
+    case 'v':
+        return operand;
+    case 't':
+        operand.kind = Kind::TEXT;
+        return operand;
+    case 'M':
+        operand.kind = Kind::MATRIX;
+        return operand;
+    case 'T':
+        operand.kind = Kind::TRANSPOSED;
+        return operand;
+    case 'Q':
+        operand.kind = Kind::SQUARE;
+        return operand;
+    default:
+        break;
+    }
+    if (std::isdigit(static_cast<unsigned char>(letter)) != 0) {
+        operand.kind = Kind::FLOATING;
+        operand.isFloat = true;
+        operand.size = letter - '0';
+        return operand;
+    }
+    switch (std::toupper(static_cast<unsigned char>(letter))) {
+    case 'N':
+        operand.kind = Kind::NUMBER;
+        break;
+    case 'F':
+        operand.kind = Kind::FLOATING;
+        break;
+    case 'I':
+        operand.kind = Kind::INTEGER;
+        break;
+    default:
+        operand.kind = Kind::BOOLEAN;
+        break;
+    }
+    if (std::islower(static_cast<unsigned char>(letter)) != 0)
+        operand.size = 1;
+    else if (std::isdigit(static_cast<unsigned char>(*at)) != 0)
+        operand.size = *at++ - '0';
+    return operand;
+}
+
+BuiltinFunction read(const Row& row, bool isGlslName) {
+    BuiltinFunction function;
+    function.name = row.name;
+    function.form = row.form;
+    function.helper = row.helper;
+    function.isGlslName = isGlslName;
+    const char* at = row.signature;
+    function.result = readOperand(at);
+    while (*at == '(' || *at == ',') {
+        ++at;
+        function.parameters.push_back(readOperand(at));
+    }
+    const bool comparesDepth =
+        !function.parameters.empty() && (function.parameters[0].sampler == Sampler::D1_SHADOW ||
+                                         function.parameters[0].sampler == Sampler::D2_SHADOW ||
+                                         function.parameters[0].sampler == Sampler::RECT_SHADOW);
+    // A projected look-up with four coordinates and one into a 1D texture with two are mostly meant as plain
+    // ones.
+    const bool isAmbiguous = function.name.find("proj") != Name::npos || function.name == "tex1D";
+    function.needsShadowName = comparesDepth && isAmbiguous;
+    return function;
+}
+
+using FunctionMap = std::unordered_map<Name, std::vector<BuiltinFunction>>;
+
+const FunctionMap& functionMap() {
+    static const FunctionMap MAP = [] {
+        FunctionMap map;
+        for (const Row& row : CG_ROWS)
+            map[row.name].push_back(read(row, false));
+        for (const Row& row : GLSL_ROWS)
+            map[row.name].push_back(read(row, true));
+        return map;
+    }();
+    return MAP;
+}
+
+const Helper* findRow(Name name) {
+    for (const Helper& helper : HELPERS)
+        if (name == helper.name)
+            return &helper;
+    return nullptr;
+}
+
+/// @return the letter of the scalar kind in front of a typed look-up's name, or 0: `h4tex2D`
+char typedLookup(Name name) {
+    const bool hasType = name.size() > 5 && (name[0] == 'f' || name[0] == 'h' || name[0] == 'x') &&
+                         name[1] >= '1' && name[1] <= '4' && name.substr(2, 3) == "tex";
+    return hasType ? name[0] : '\0';
+}
+
+} // namespace
+
+BuiltinLookup findBuiltin(Name name) {
+    BuiltinLookup lookup;
+    if (const char kind = typedLookup(name)) {
+        lookup.resultKind = kind;
+        lookup.resultSize = name[1] - '0';
+        name = name.substr(2);
+    }
+    const auto found = functionMap().find(name);
+    if (found != functionMap().end())
+        lookup.functions = &found->second;
+    return lookup;
+}
+
+std::vector<Name> builtinNames() {
+    std::vector<Name> names;
+    for (const auto& entry : functionMap())
+        names.push_back(entry.first);
+    return names;
+}
+
+HelperFunction findHelper(Name name, const std::string& type) {
+    HelperFunction result;
+    const int size = type.find("vec") == std::string::npos ? 1 : type.back() - '0';
+    const Helper* helper = size == 1 ? findRow(std::string(name) + "1") : nullptr;
+    if (!helper)
+        helper = findRow(name);
+    if (!helper)
+        return result;
+    result.needs = helper->needs;
+    const std::string bools = size == 1 ? "bool" : "bvec" + std::to_string(size);
+    const Name text = helper->text;
+    const auto isWord = [&](std::size_t at) {
+        const auto continues = [&](std::size_t i) {
+            return i < text.size() &&
+                   (std::isalnum(static_cast<unsigned char>(text[i])) != 0 || text[i] == '_');
+        };
+        return !continues(at + 1) && (at == 0 || !continues(at - 1));
+    };
+    for (std::size_t i = 0; i < text.size(); ++i) {
+        const bool isPlaceholder = (text[i] == 'T' || text[i] == 'B' || text[i] == 'N') && isWord(i);
+        if (!isPlaceholder)
+            result.text += text[i];
+        else if (text[i] == 'N')
+            result.text += std::to_string(size);
+        else
+            result.text += text[i] == 'T' ? type : bools;
+    }
+    return result;
+}
+
+} // namespace cg

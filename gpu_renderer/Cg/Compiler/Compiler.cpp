@@ -1,0 +1,62 @@
+#include <Cg/Compiler/Compiler.h>
+
+#include <Cg/Compiler/Arena.h>
+#include <Cg/Compiler/Diagnostics.h>
+#include <Cg/Compiler/GlslEmitter.h>
+#include <Cg/Compiler/ParameterList.h>
+#include <Cg/Compiler/Parser.h>
+#include <Cg/Compiler/Preprocessor.h>
+#include <Cg/Compiler/References.h>
+#include <Cg/Compiler/Resolver.h>
+#include <Cg/Compiler/SourceFiles.h>
+
+namespace cg {
+
+namespace {
+
+/// What programs ask for to know whom they are compiled by and for.
+PreprocessorOptions preprocessorOptions(const CompileRequest& request) {
+    PreprocessorOptions options;
+    options.reader = request.reader;
+    options.includeFolders = request.includeFolders;
+    options.macros = {{"__CG__", "1"}, {"__CGC__", "1"}};
+    if (request.stage == Stage::VERTEX)
+        options.macros.insert(options.macros.end(), {{"PROFILE_GLSLV", "1"}, {"__GLSLV__", "1"}});
+    else
+        options.macros.insert(options.macros.end(), {{"PROFILE_GLSLF", "1"}, {"__GLSLF__", "1"}});
+    options.macros.insert(options.macros.end(), request.macros.begin(), request.macros.end());
+    return options;
+}
+
+void translate(const CompileRequest& request, SourceFiles& files, Diagnostics& diagnostics,
+               CompileResult& result) {
+    const std::uint32_t mainFile = files.add(request.fileName, request.source);
+    const std::vector<Token> tokens = preprocess(files, mainFile, preprocessorOptions(request), diagnostics);
+    Arena arena;
+    const TranslationUnit* unit = parse(tokens, arena, diagnostics);
+    if (diagnostics.hasErrors())
+        return;
+    TypeTable types(arena);
+    const TypedProgram* program =
+        Resolver(*unit, request.stage, arena, types, diagnostics).resolve(request.entry);
+    if (diagnostics.hasErrors())
+        return;
+    const References references(*program);
+    GlslEmitter emitter(*program, types, request.stage, references);
+    result.glsl = emitter.emit();
+    result.parameters = listParameters(*program, references, emitter);
+    result.ok = true;
+}
+
+} // namespace
+
+CompileResult compile(const CompileRequest& request) {
+    CompileResult result;
+    SourceFiles files;
+    Diagnostics diagnostics;
+    translate(request, files, diagnostics, result);
+    result.listing = diagnostics.listing(files);
+    return result;
+}
+
+} // namespace cg

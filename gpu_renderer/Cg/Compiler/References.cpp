@@ -1,0 +1,79 @@
+#include <Cg/Compiler/References.h>
+
+#include <algorithm>
+
+namespace cg {
+
+namespace {
+
+/// @return the variable that an expression is a part of, and the members on the way; null where it is none
+const Variable* walk(const TypedExpr* expression, std::string& path) {
+    using Kind = TypedExpr::Kind;
+    if (expression->kind == Kind::VARIABLE)
+        return expression->variable;
+    if (expression->kind != Kind::FIELD && expression->kind != Kind::ELEMENT)
+        return nullptr;
+    const TypedExpr* object = expression->operands[0];
+    const Variable* variable = walk(object, path);
+    if (variable && expression->kind == Kind::FIELD)
+        path += "." + std::string(
+                          object->type->structure->fields[static_cast<std::size_t>(expression->index)].name);
+    return variable;
+}
+
+bool isWithin(const std::string& inner, const std::string& outer) {
+    return inner.compare(0, outer.size(), outer) == 0 &&
+           (inner.size() == outer.size() || inner[outer.size()] == '.');
+}
+
+} // namespace
+
+References::References(const TypedProgram& program) {
+    for (const Function* function : program.functions)
+        if (function->body)
+            visit(function->body);
+    for (const StageValue& value : program.values)
+        visit(value.place);
+}
+
+void References::note(const Variable* variable, const std::string& path) {
+    const bool isNew = mPaths.count(variable) == 0;
+    mPaths[variable].insert(path);
+    if (isNew && variable->initializer && variable->storage == Variable::Storage::GLOBAL)
+        visit(variable->initializer);
+    if (isNew && variable->samplerOwner)
+        note(variable->samplerOwner, variable->samplerPath);
+}
+
+void References::visit(const TypedExpr* expression) {
+    std::string path;
+    if (const Variable* variable = walk(expression, path)) {
+        note(variable, path);
+        for (const TypedExpr* part = expression; part->kind != TypedExpr::Kind::VARIABLE;
+             part = part->operands[0])
+            if (part->kind == TypedExpr::Kind::ELEMENT)
+                visit(part->operands[1]);
+        return;
+    }
+    for (const TypedExpr* operand : expression->operands)
+        visit(operand);
+}
+
+void References::visit(const TypedStmt* stmt) {
+    if (stmt->expression)
+        visit(stmt->expression);
+    if (stmt->step)
+        visit(stmt->step);
+    for (const TypedStmt* inner : stmt->body)
+        if (inner)
+            visit(inner);
+}
+
+bool References::uses(const Variable* variable, const std::string& path) const {
+    const auto found = mPaths.find(variable);
+    return found != mPaths.end() &&
+           std::any_of(found->second.begin(), found->second.end(),
+                       [&](const std::string& used) { return isWithin(path, used) || isWithin(used, path); });
+}
+
+} // namespace cg

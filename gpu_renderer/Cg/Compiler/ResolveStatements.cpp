@@ -1,0 +1,252 @@
+#include <Cg/Compiler/Resolver.h>
+
+#include <Cg/Compiler/Diagnostics.h>
+
+#include <algorithm>
+
+namespace cg {
+
+namespace {
+
+TypedStmt* make(Arena& arena, TypedStmt::Kind kind, TypedExpr* expression = nullptr) {
+    auto* stmt = arena.make<TypedStmt>(kind);
+    stmt->expression = expression;
+    return stmt;
+}
+
+bool hasEffect(const TypedExpr* expression) {
+    switch (expression->kind) {
+    case TypedExpr::Kind::CALL:
+    case TypedExpr::Kind::ASSIGN:
+        return true;
+    case TypedExpr::Kind::BUILTIN:
+        return true; // some write to their arguments
+    case TypedExpr::Kind::UNARY:
+        return expression->unary >= UnaryOp::PRE_INCREMENT || hasEffect(expression->operands[0]);
+    default:
+        return std::any_of(expression->operands.begin(), expression->operands.end(), hasEffect);
+    }
+}
+
+} // namespace
+
+/// @return null for a statement without effect, and after an error
+TypedStmt* Resolver::statement(const Stmt* stmt) {
+    using Kind = Stmt::Kind;
+    if (!stmt || mDiagnostics.isFull())
+        return nullptr;
+    switch (stmt->kind) {
+    case Kind::BLOCK:
+        return block(static_cast<const BlockStmt*>(stmt));
+    case Kind::DECL:
+        return declarations(static_cast<const DeclStmt*>(stmt));
+    case Kind::EXPR:
+        return expressionStatement(expression(static_cast<const ExprStmt*>(stmt)->expression));
+    case Kind::IF: {
+        const auto* branch = static_cast<const IfStmt*>(stmt);
+        TypedExpr* condition = expression(branch->condition);
+        condition = condition ? mBuild.condition(condition) : nullptr;
+        TypedStmt* result = make(mArena, TypedStmt::Kind::IF, condition);
+        result->body = {scoped(branch->thenBranch),
+                        branch->elseBranch ? scoped(branch->elseBranch) : nullptr};
+        return condition ? result : nullptr;
+    }
+    case Kind::FOR:
+        return forLoop(static_cast<const ForStmt*>(stmt));
+    case Kind::WHILE:
+    case Kind::DO: {
+        const auto* loop = static_cast<const LoopStmt*>(stmt);
+        TypedExpr* condition = expression(loop->condition);
+        condition = condition ? mBuild.condition(condition) : nullptr;
+        TypedStmt* result =
+            make(mArena, stmt->kind == Kind::WHILE ? TypedStmt::Kind::WHILE : TypedStmt::Kind::DO, condition);
+        result->body = {scoped(loop->body)};
+        return condition ? result : nullptr;
+    }
+    case Kind::SWITCH:
+        return switchStatement(static_cast<const SwitchStmt*>(stmt));
+    case Kind::CASE: {
+        const auto* label = static_cast<const CaseStmt*>(stmt);
+        TypedExpr* value = label->value ? expression(label->value) : nullptr;
+        if (value)
+            value = mBuild.convert(value, mTypes.scalar(Scalar::INT));
+        return value || !label->value ? make(mArena, TypedStmt::Kind::CASE, value) : nullptr;
+    }
+    case Kind::RETURN:
+        return returnStatement(static_cast<const JumpStmt*>(stmt));
+    case Kind::DISCARD:
+        return discardStatement(static_cast<const JumpStmt*>(stmt));
+    case Kind::BREAK:
+        return make(mArena, TypedStmt::Kind::BREAK);
+    case Kind::CONTINUE:
+        return make(mArena, TypedStmt::Kind::CONTINUE);
+    }
+    return nullptr;
+}
+
+TypedStmt* Resolver::block(const BlockStmt* stmt) {
+    TypedStmt* result = make(mArena, TypedStmt::Kind::BLOCK);
+    const std::size_t outerScope = mContext.scope.size();
+    std::vector<TypedStmt*>* outerStatements = mContext.statements;
+    mContext.statements = &result->body;
+    for (const Stmt* inner : stmt->statements)
+        if (TypedStmt* resolved = statement(inner))
+            result->body.push_back(resolved);
+    mContext.statements = outerStatements;
+    mContext.scope.resize(outerScope);
+    return result;
+}
+
+/// A branch or a loop's body: always a block, never null.
+TypedStmt* Resolver::scoped(const Stmt* stmt) {
+    if (stmt && stmt->kind == Stmt::Kind::BLOCK)
+        return block(static_cast<const BlockStmt*>(stmt));
+    BlockStmt only(stmt ? stmt->location : SourceLocation());
+    if (stmt)
+        only.statements.push_back(const_cast<Stmt*>(stmt));
+    return block(&only);
+}
+
+TypedStmt* Resolver::expressionStatement(TypedExpr* expression) {
+    return expression && hasEffect(expression) ? make(mArena, TypedStmt::Kind::EXPR, expression) : nullptr;
+}
+
+TypedStmt* Resolver::declarations(const DeclStmt* stmt) {
+    TypedStmt* result = make(mArena, TypedStmt::Kind::SEQUENCE);
+    std::vector<TypedStmt*>* outer = mContext.statements;
+    mContext.statements = &result->body;
+    for (const Decl* declaration : stmt->declarations)
+        switch (declaration->kind) {
+        case Decl::Kind::VARIABLE:
+            declareLocal(static_cast<const VariableDecl*>(declaration), result->body);
+            break;
+        case Decl::Kind::STRUCT: {
+            const auto* structure = static_cast<const StructDecl*>(declaration);
+            mContext.scope.push_back({structure->name, nullptr, structType(structure)});
+            break;
+        }
+        case Decl::Kind::TYPEDEF: {
+            const auto* alias = static_cast<const TypedefDecl*>(declaration);
+            if (const Type* type = typeOf(alias->type, alias->dimensions))
+                mContext.scope.push_back({alias->name, nullptr, type});
+            break;
+        }
+        case Decl::Kind::FUNCTION: // a prototype within a function says nothing new
+            break;
+        }
+    mContext.statements = outer;
+    return result;
+}
+
+void Resolver::declareLocal(const VariableDecl* declaration, std::vector<TypedStmt*>& out) {
+    const Type* type = typeOf(declaration->type, declaration->dimensions);
+    const StructDecl* definition = declaration->type->definition;
+    if (definition && !definition->name.empty())
+        mContext.scope.push_back({definition->name, nullptr, structType(definition)});
+    Variable* variable = makeVariable(Variable::Storage::LOCAL, declaration->name, type, declaration);
+    TypedExpr* value = nullptr;
+    if (type && declaration->initializer && !isOpaque(type)) {
+        value = initializer(type, declaration->initializer);
+        variable->type = type;
+        if (!value)
+            type = nullptr;
+    } else if (type && declaration->initializer) {
+        variable->alias = expression(declaration->initializer);
+    }
+    const bool isSized = type && !type->isVoid() && (!type->isArray() || type->length != Type::UNSIZED);
+    if (type && !isSized)
+        mDiagnostics.error(declaration->location,
+                           inQuotes(declaration->name) + " cannot be '" + nameOf(type) + "'");
+    if (!variable->type)
+        variable->type = mTypes.scalar(Scalar::FLOAT); // after an error: the name is known at least
+    variable->isConst = declaration->qualifiers.isConst;
+    if (variable->isConst)
+        variable->initializer = value;
+    mContext.scope.push_back({declaration->name, variable, nullptr});
+    if (!isSized || isOpaque(variable->type))
+        return;
+    if (value && containsSampler(variable->type))
+        aliasSamplers(declaration->location, mBuild.variable(declaration->location, variable), value);
+    TypedStmt* stmt = make(mArena, TypedStmt::Kind::DECLARE, value);
+    stmt->variable = variable;
+    out.push_back(stmt);
+}
+
+TypedStmt* Resolver::forLoop(const ForStmt* stmt) {
+    const std::size_t outerScope = mContext.scope.size();
+    TypedStmt* result = make(mArena, TypedStmt::Kind::FOR);
+    TypedStmt* first = statement(stmt->initializer);
+    if (stmt->condition) {
+        TypedExpr* condition = expression(stmt->condition);
+        result->expression = condition ? mBuild.condition(condition) : nullptr;
+    }
+    if (stmt->step)
+        result->step = expression(stmt->step);
+    result->body = {first, scoped(stmt->body)};
+    mContext.scope.resize(outerScope);
+    return result;
+}
+
+TypedStmt* Resolver::switchStatement(const SwitchStmt* stmt) {
+    TypedExpr* selector = expression(stmt->selector);
+    selector = selector ? mBuild.convert(selector, mTypes.scalar(Scalar::INT)) : nullptr;
+    if (!selector)
+        return nullptr;
+    TypedStmt* result = make(mArena, TypedStmt::Kind::SWITCH, selector);
+    result->body = block(stmt->body)->body;
+    return result;
+}
+
+TypedStmt* Resolver::returnStatement(const JumpStmt* stmt) {
+    const Type* wanted = mContext.function->result;
+    TypedStmt* result = make(mArena, TypedStmt::Kind::RETURN);
+    if (!stmt->value) {
+        if (wanted->isVoid())
+            return result;
+        mDiagnostics.error(stmt->location,
+                           "return without a value in a function that gives '" + nameOf(wanted) + "'");
+        return nullptr;
+    }
+    TypedExpr* value = expression(stmt->value);
+    if (!value)
+        return nullptr;
+    if (wanted->isVoid() && value->type->isVoid()) {
+        if (TypedStmt* effect = expressionStatement(value))
+            mContext.statements->push_back(effect);
+        return result;
+    }
+    if (wanted->isVoid()) {
+        mDiagnostics.error(stmt->location, "return with a value in a void function");
+        return nullptr;
+    }
+    result->expression = mBuild.convert(value, wanted);
+    return result->expression ? result : nullptr;
+}
+
+TypedStmt* Resolver::discardStatement(const JumpStmt* stmt) {
+    if (mStage == Stage::VERTEX) {
+        mDiagnostics.error(stmt->location, "discard is for fragment programs");
+        return nullptr;
+    }
+    TypedStmt* result = make(mArena, TypedStmt::Kind::DISCARD);
+    if (!stmt->value)
+        return result;
+    TypedExpr* condition = expression(stmt->value);
+    if (!condition)
+        return nullptr;
+    if (condition->type->isVector()) {
+        const Type* bools = mTypes.vector(Scalar::BOOL, condition->type->columns);
+        condition = mBuild.builtin(stmt->location, mTypes.scalar(Scalar::BOOL), "any($0)",
+                                   {mBuild.cast(stmt->location, condition, bools)});
+    }
+    condition = mBuild.condition(condition);
+    if (!condition)
+        return nullptr;
+    TypedStmt* body = make(mArena, TypedStmt::Kind::BLOCK);
+    body->body.push_back(result);
+    TypedStmt* branch = make(mArena, TypedStmt::Kind::IF, condition);
+    branch->body = {body, nullptr};
+    return branch;
+}
+
+} // namespace cg
