@@ -87,15 +87,17 @@ Element encodePixel(const Plane<Element>& plane, const PatternPixel& pixel) {
     return static_cast<Element>(components[plane.component]);
 }
 
+// The layout comes as a copy: the compiler then sees that no pixel stored can change it.
+
 template <class Layout>
-void encodeRun(const Layout& layout, const PatternRun& run, uint32_t count, typename Layout::Pixel* pixels) {
+void encodeRun(Layout layout, const PatternRun& run, uint32_t count, typename Layout::Pixel* pixels) {
     const auto& [r, g, b, a] = run.components;
     for (uint32_t i = 0; i < count; ++i)
         pixels[i] = layout.encode(r[i], g[i], b[i], a[i]);
 }
 
 template <class Element>
-void encodeRun(const Plane<Element>& plane, const PatternRun& run, uint32_t count, Element* pixels) {
+void encodeRun(Plane<Element> plane, const PatternRun& run, uint32_t count, Element* pixels) {
     const uint32_t* const component = run.components[plane.component];
     for (uint32_t i = 0; i < count; ++i)
         pixels[i] = static_cast<Element>(component[i]);
@@ -139,7 +141,7 @@ private:
         case LineVariation::SPAN:
             return fillSpans();
         case LineVariation::SEPARABLE:
-            return isConstantAlongLines() ? fillFlatLines() : fillSeparable();
+            return fillSeparable();
         }
     }
 
@@ -165,8 +167,11 @@ private:
     /// fills.
     void fillShifted() {
         build(mX % DIAGONAL_PERIOD, 0, mCount + DIAGONAL_PERIOD);
+        const PixelRows<Pixel> rows = mRows;
+        const uint32_t x = mX;
+        const uint32_t count = mCount;
         for (uint32_t y = mBegin; y < mEnd; ++y)
-            mRows.copy(mX, y, mPiece + DIAGONAL_PERIOD - y % DIAGONAL_PERIOD, mCount);
+            rows.copy(x, y, mPiece + DIAGONAL_PERIOD - y % DIAGONAL_PERIOD, count);
     }
 
     void fillSpans() {
@@ -189,24 +194,34 @@ private:
     }
 
     void fillSeparable() {
+        constexpr uint32_t LINE_COMPONENT = 1U << SEPARABLE_LINE_COMPONENT;
+        if (mPicture.wanted == LINE_COMPONENT)
+            return fillFlatLines();
         build(mX, mBegin, mCount);
+        if ((mPicture.wanted & LINE_COMPONENT) != 0)
+            copyChangingLines();
+        else
+            copyToLines(mBegin, mEnd);
+    }
+
+    void fillFlatLines() {
+        for (uint32_t y = mBegin; y < mEnd; ++y)
+            repeatOnLines(y, y + 1, pixelAt(mX, y));
+    }
+
+    /// From band to band all pixels of a line change by the same bits.
+    void copyChangingLines() {
         Pixel held = pixelAt(mX, mBegin);
         for (uint32_t y = mBegin; y < mEnd;) {
             const Band band = bandAt(mPicture, y, mEnd);
             const Pixel pixel = pixelAt(mX, y);
-            flipBits(mPiece, mCount * sizeof(Pixel), repeatedInWord(static_cast<Pixel>(held ^ pixel)));
+            if (pixel != held)
+                flipBits(mPiece, mCount * sizeof(Pixel), repeatedInWord(static_cast<Pixel>(held ^ pixel)));
             held = pixel;
             copyToLines(y, band.end);
             y = band.end;
         }
     }
-
-    void fillFlatLines() {
-        for (uint32_t y = mBegin; y < mEnd; ++y)
-            mRows.repeat(mX, y, pixelAt(mX, y), mCount);
-    }
-
-    bool isConstantAlongLines() const { return mPicture.wanted == 1U << SEPARABLE_LINE_COMPONENT; }
 
     void build(uint32_t x, uint32_t y, uint32_t count) {
         PatternRun run;
@@ -219,14 +234,21 @@ private:
 
     Pixel pixelAt(uint32_t x, uint32_t y) const { return encodePixel(mLayout, patternPixel(mPicture, x, y)); }
 
+    /// Works on copies: what is written to the buffer might be any member as far as the compiler knows.
     void copyToLines(uint32_t begin, uint32_t end) const {
+        const PixelRows<Pixel> rows = mRows;
+        const uint32_t x = mX;
+        const uint32_t count = mCount;
         for (uint32_t y = begin; y < end; ++y)
-            mRows.copy(mX, y, mPiece, mCount);
+            rows.copy(x, y, mPiece, count);
     }
 
     void repeatOnLines(uint32_t begin, uint32_t end, Pixel pixel) const {
+        const PixelRows<Pixel> rows = mRows;
+        const uint32_t x = mX;
+        const uint32_t count = mCount;
         for (uint32_t y = begin; y < end; ++y)
-            mRows.repeat(mX, y, pixel, mCount);
+            rows.repeat(x, y, pixel, count);
     }
 
     /// In columns of the piece.
@@ -250,7 +272,7 @@ private:
     uint32_t mX = 0;
     uint32_t mCount = 0;
 
-    Pixel mPiece[PIECE + DIAGONAL_PERIOD]; ///< the part of one line that lies in these columns
+    alignas(64) Pixel mPiece[PIECE + DIAGONAL_PERIOD]; ///< the part of one line that lies in these columns
 };
 
 template <class Layout>

@@ -57,6 +57,10 @@ uint32_t truncated(float value) {
     return value > -LIMIT && value < LIMIT ? static_cast<uint32_t>(static_cast<int64_t>(value)) : 0;
 }
 
+constexpr uint32_t maskOf(bool isSet) {
+    return 0U - static_cast<uint32_t>(isSet);
+}
+
 /// From 0 at position 0 to full scale at position size.
 uint32_t rampTo(uint32_t position, uint32_t size, const Depth& depth) {
     return truncated(static_cast<float>(position) * depth.maxF / static_cast<float>(size));
@@ -114,11 +118,12 @@ int32_t discHalfWidth(const PatternPicture& picture, uint32_t y) {
 
 struct Combi {
     static Pixel at(const Canvas& canvas, uint32_t x, uint32_t y) {
-        const bool isGrey = y >= COMBI_COMPONENT_LINES;
-        const uint32_t level = canvas.top8(isGrey && y <= COMBI_LAST_VERTICAL_LINE ? y : x);
         // Masks rather than choices: a loop along the line then takes several pixels at a time.
-        const auto on = [&](uint32_t line) { return isGrey || y == line ? ~0U : 0; };
-        return {level & on(2), level & on(1), level & on(0), isGrey ? canvas.depth.max : level & on(3)};
+        const uint32_t grey = maskOf(y >= COMBI_COMPONENT_LINES);
+        const uint32_t vertical = grey & maskOf(y <= COMBI_LAST_VERTICAL_LINE);
+        const uint32_t level = canvas.top8((y & vertical) | (x & ~vertical));
+        return {level & (grey | maskOf(y == 2)), level & (grey | maskOf(y == 1)),
+                level & (grey | maskOf(y == 0)), (canvas.depth.max & grey) | (level & maskOf(y == 3))};
     }
 };
 
