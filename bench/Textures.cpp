@@ -1,0 +1,189 @@
+// Construction and transfers of textures beside the raw OpenGL calls, or beside memcpy where the driver does
+// no more.
+
+#include "BenchmarkRow.h"
+
+#include <FwZel/Texture.h>
+#include <FwZel/VideoTestImage.h>
+#include <HeadlessContext.h>
+
+#include <epoxy/gl.h>
+
+#include <malloc.h>
+
+#include <cstdlib>
+#include <cstring>
+#include <memory>
+#include <vector>
+
+namespace {
+
+struct Format {
+    const char* name;
+    bool isHalf;
+    size_t bytesPerPixel;
+    GLint internal;
+    GLenum type;
+};
+
+constexpr Format FORMATS[] = {{"8bit", false, 4, GL_RGBA, GL_UNSIGNED_BYTE},
+                              {"half", true, 8, GL_RGBA16F, GL_HALF_FLOAT}};
+
+struct Size {
+    const char* name;
+    uint32_t width, height;
+};
+
+constexpr Size SIZES[] = {{"1920x1080", 1920, 1080}, {"3840x2160", 3840, 2160}};
+
+Texture::TexArgs argsOf(const Size& size, const Format& format) {
+    Texture::TexArgs args;
+    Texture::setDefaultValue(args);
+    args.width = args.pitchInPix = size.width;
+    args.height = size.height;
+    args.isFp16 = format.isHalf;
+    return args;
+}
+
+void addCompared(const std::string& group, const Size& size, const Format& format, const Work& limit,
+                 const Work& ours) {
+    const std::string prefix = group + '-' + format.name + '/' + size.name + '/';
+    const size_t bytes = size_t{size.width} * size.height * format.bytesPerPixel;
+    addRow(prefix + "limit", bytes, limit);
+    addRow(prefix + "limit-again", bytes, limit);
+    addRow(prefix + "ours", bytes, ours);
+}
+
+void setParameters() {
+    glTexParameteri(GL_TEXTURE_2D, GL_TEXTURE_MAG_FILTER, GL_LINEAR);
+    glTexParameteri(GL_TEXTURE_2D, GL_TEXTURE_MIN_FILTER, GL_LINEAR);
+    glTexParameteri(GL_TEXTURE_2D, GL_TEXTURE_WRAP_S, GL_CLAMP_TO_EDGE);
+    glTexParameteri(GL_TEXTURE_2D, GL_TEXTURE_WRAP_T, GL_CLAMP_TO_EDGE);
+}
+
+/// A fresh buffer filled by copies of one row, and the OpenGL calls of a texture without PBOs and FBOs.
+void constructByHand(const Size& size, const Format& format) {
+    constexpr size_t ALIGNMENT = 128;
+    const size_t pitch = size.width * format.bytesPerPixel;
+    const std::unique_ptr<void, decltype(&std::free)> buffer(memalign(ALIGNMENT, pitch * size.height),
+                                                             &std::free);
+    const std::vector<unsigned char> row(pitch, 0x55);
+    for (size_t y = 0; y < size.height; ++y)
+        std::memcpy(static_cast<unsigned char*>(buffer.get()) + y * pitch, row.data(), pitch);
+    GLuint name = 0;
+    glGenTextures(1, &name);
+    glBindTexture(GL_TEXTURE_2D, name);
+    setParameters();
+    glTexImage2D(GL_TEXTURE_2D, 0, format.internal, static_cast<GLsizei>(size.width),
+                 static_cast<GLsizei>(size.height), 0, GL_RGBA, format.type, nullptr);
+    glBindTexture(GL_TEXTURE_2D, 0);
+    glDeleteTextures(1, &name);
+}
+
+void addConstruction(const Size& size, const Format& format) {
+    addCompared(
+        "construction", size, format, [=] { constructByHand(size, format); },
+        [=] { const Texture texture(VideoTestImage::COLOUR_BAR_75, argsOf(size, format)); });
+}
+
+void addUploads(const Size& size, const Format& format) {
+    Texture::TexArgs args = argsOf(size, format);
+    args.isPBO = true;
+    const auto texture = std::make_shared<Texture>(VideoTestImage::COLOUR_BAR_75, args);
+    const size_t bytes = size_t{size.width} * size.height * format.bytesPerPixel;
+    const auto width = static_cast<GLsizei>(size.width);
+    const auto height = static_cast<GLsizei>(size.height);
+
+    addCompared(
+        "transfer-host-to-texture", size, format,
+        [=] {
+            glBindTexture(GL_TEXTURE_2D, texture->getGLTexID(0));
+            glTexImage2D(GL_TEXTURE_2D, 0, format.internal, width, height, 0, GL_RGBA, format.type,
+                         texture->getHostBufPtr(0));
+            glBindTexture(GL_TEXTURE_2D, 0);
+        },
+        [=] { texture->copyHostBufToGLTex(0); });
+    addCompared(
+        "transfer-host-to-pbo", size, format,
+        [=] {
+            glBindBuffer(GL_PIXEL_UNPACK_BUFFER, texture->getPboID(0));
+            std::memcpy(glMapBuffer(GL_PIXEL_UNPACK_BUFFER, GL_WRITE_ONLY), texture->getHostBufPtr(0), bytes);
+            glUnmapBuffer(GL_PIXEL_UNPACK_BUFFER);
+            glBindBuffer(GL_PIXEL_UNPACK_BUFFER, 0);
+        },
+        [=] { texture->copyHostBufToPBO(0); });
+    addCompared(
+        "transfer-pbo-to-texture", size, format,
+        [=] {
+            glBindTexture(GL_TEXTURE_2D, texture->getGLTexID(0));
+            glBindBuffer(GL_PIXEL_UNPACK_BUFFER, texture->getPboID(0));
+            glTexSubImage2D(GL_TEXTURE_2D, 0, 0, 0, width, height, GL_RGBA, format.type, nullptr);
+            glBindBuffer(GL_PIXEL_UNPACK_BUFFER, 0);
+            glBindTexture(GL_TEXTURE_2D, 0);
+        },
+        [=] { texture->copyPBOToGLTex(0); });
+}
+
+void addReadback(const Size& size, const Format& format) {
+    Texture::TexArgs args = argsOf(size, format);
+    args.isPBO = args.isFBO = true;
+    args.pboAccessType = GL_READ_ONLY;
+    const auto texture = std::make_shared<Texture>(VideoTestImage::COLOUR_BAR_75, args);
+    texture->copyHostBufToGLTex(0);
+    const size_t bytes = size_t{size.width} * size.height * format.bytesPerPixel;
+    const auto width = static_cast<GLsizei>(size.width);
+    const auto height = static_cast<GLsizei>(size.height);
+    GLuint onDevice = 0;
+    glGenBuffers(1, &onDevice); // lives as long as the context
+    glBindBuffer(GL_PIXEL_PACK_BUFFER, onDevice);
+    glBufferData(GL_PIXEL_PACK_BUFFER, static_cast<GLsizeiptr>(bytes), nullptr, GL_STATIC_COPY);
+    glBindBuffer(GL_PIXEL_PACK_BUFFER, 0);
+
+    addCompared(
+        "transfer-texture-to-pbo", size, format,
+        [=] {
+            glBindFramebufferEXT(GL_FRAMEBUFFER_EXT, texture->getFboID(0));
+            glReadBuffer(GL_COLOR_ATTACHMENT0_EXT);
+            glBindBuffer(GL_PIXEL_PACK_BUFFER, onDevice);
+            glReadPixels(0, 0, width, height, GL_RGBA, format.type, nullptr);
+            glBindBuffer(GL_COPY_WRITE_BUFFER, texture->getPboID(0));
+            glCopyBufferSubData(GL_PIXEL_PACK_BUFFER, GL_COPY_WRITE_BUFFER, 0, 0,
+                                static_cast<GLsizeiptr>(bytes));
+            glBindBuffer(GL_COPY_WRITE_BUFFER, 0);
+            glBindBuffer(GL_PIXEL_PACK_BUFFER, 0);
+            glBindFramebufferEXT(GL_FRAMEBUFFER_EXT, 0);
+        },
+        [=] { texture->readbackGLTexToPBO(0); });
+    addCompared(
+        "transfer-pbo-to-host", size, format,
+        [=] {
+            glBindBuffer(GL_PIXEL_PACK_BUFFER, texture->getPboID(0));
+            std::memcpy(texture->getHostBufPtr(0), glMapBuffer(GL_PIXEL_PACK_BUFFER, GL_READ_ONLY), bytes);
+            glUnmapBuffer(GL_PIXEL_PACK_BUFFER);
+            glBindBuffer(GL_PIXEL_PACK_BUFFER, 0);
+        },
+        [=] { texture->readbackPBOToHostBuf(0); });
+}
+
+} // namespace
+
+int main(int argc, char** argv) {
+    benchmark::Initialize(&argc, argv);
+    if (benchmark::ReportUnrecognizedArguments(argc, argv))
+        return 2;
+    // Both sides of a construction get fresh pages: glibc would raise the threshold after the first large
+    // buffer.
+    constexpr int ONE_MIB = 1 << 20;
+    mallopt(M_MMAP_THRESHOLD, ONE_MIB);
+    const host::HeadlessContext context;
+    for (const Size& size : SIZES)
+        for (const Format& format : FORMATS) {
+            addConstruction(size, format);
+            addUploads(size, format);
+            addReadback(size, format);
+        }
+    benchmark::RunSpecifiedBenchmarks();
+    benchmark::ClearRegisteredBenchmarks(); // with them go the textures, while there is a context
+    benchmark::Shutdown();
+    return 0;
+}
