@@ -21,7 +21,7 @@ namespace cg {
 namespace {
 
 constexpr std::size_t MAX_INCLUDE_DEPTH = 64;
-constexpr std::size_t MAX_TOKENS = 4'000'000;
+constexpr std::size_t MAX_TOKENS = 1'000'000;
 
 /// What an include counts beside its tokens, so that empty files are bounded as well.
 constexpr std::size_t INCLUDE_COST = 200;
@@ -83,7 +83,8 @@ public:
         defineSpecial("__LINE__", Macro::Special::LINE);
         defineSpecial("__FILE__", Macro::Special::FILE);
         for (const auto& [name, text] : options.macros) {
-            Lexer lexer(files, files.keep(name + ' ' + text), {mainFile, 0, 1}, diagnostics);
+            Lexer lexer(files, files.keep(std::string(name).append(" ").append(text)), {mainFile, 0, 1},
+                        diagnostics);
             define(lexer);
         }
         open(mainFile);

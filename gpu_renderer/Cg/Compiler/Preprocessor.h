@@ -27,7 +27,7 @@ struct PreprocessorOptions {
 /// one, up to the main file, then in includeFolders; `"x"` and `<x>` are the same. `#pragma` is ignored but
 /// for `#pragma once`. Words after `#else`, `#endif` and `#ifdef NAME` are a warning.
 ///
-/// What is left of the program's size is bounded, so that no text takes long: 64 nested includes, 4 million
+/// What is left of the program's size is bounded, so that no text takes long: 64 nested includes, a million
 /// tokens in all, with what macros and repeated includes produce. Beyond it there is an error and the program
 /// ends there.
 ///
