@@ -223,7 +223,7 @@ CG_API CGbool cgIsContext(CGcontext context);
 
 /**
  * Compiles a program from source text, to the end: Cg to GLSL, and GLSL in the driver.
- * The listing names the text "(string)"; files that it includes are looked for in the working directory.
+ * The listing names the text "<string>"; files that it includes are looked for in the working directory.
  * @param type     CG_SOURCE; anything else sets CG_INVALID_ENUMERANT_ERROR
  * @param source   Cg source, ends with a null byte; null sets CG_INVALID_PARAMETER_ERROR
  * @param profile  CG_PROFILE_GLSLV or CG_PROFILE_GLSLF; anything else sets CG_UNKNOWN_PROFILE_ERROR
