@@ -395,6 +395,7 @@ protected:
         cgGLSetParameter4fv(parameter, four.data());
     }
 
+    /// Gives the samplers of the name a texture, in both programs.
     void setTexture(const TextureSetting& setting) {
         const bool isLinear =
             std::find(mCase.linear.begin(), mCase.linear.end(), setting.name) != mCase.linear.end();
@@ -406,7 +407,7 @@ protected:
             if (CGparameter sampler = cgGetNamedParameter(program, setting.name.c_str())) {
                 mTextures.push_back(makeTexture(targetOf(cgGetParameterType(sampler)), setting, isLinear));
                 cgGLSetTextureParameter(sampler, mTextures.back());
-                cgGLEnableTextureParameter(sampler);
+                mSamplers.push_back(sampler);
                 isFound = true;
             }
         EXPECT_TRUE(isFound) << "no sampler " << setting.name;
@@ -438,6 +439,7 @@ protected:
     CGcontext mContext = nullptr;
     std::vector<CGprogram> mPrograms;
     std::vector<GLuint> mTextures;
+    std::vector<CGparameter> mSamplers;
     std::string mGlsl;
 };
 
@@ -447,13 +449,15 @@ TEST_P(CgPixels, AreThoseOfTheProgram) {
     ASSERT_NO_FATAL_FAILURE(start(mCase.fragment, CG_PROFILE_GLSLF));
     for (const Setting& setting : mCase.parameters)
         setParameter(setting);
+    FloatCanvas canvas(mCase.width, mCase.height);
     for (const TextureSetting& setting : mCase.textures)
         ASSERT_NO_FATAL_FAILURE(setTexture(setting));
+    for (CGparameter sampler : mSamplers)
+        cgGLEnableTextureParameter(sampler);
     const FixedFunctionState fixedFunction;
     for (const Setting& setting : mCase.state)
         FixedFunctionState::set(setting);
 
-    FloatCanvas canvas(mCase.width, mCase.height);
     canvas.drawQuad();
     const std::vector<Pixel> pixels = canvas.pixels();
     const auto formula = FORMULAS.find(GetParam());
