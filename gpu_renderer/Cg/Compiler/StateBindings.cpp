@@ -43,29 +43,36 @@ constexpr Matrix MATRICES[] = {{"modelview", "gl_ModelViewMatrix"},
                                {"mvp", "gl_ModelViewProjectionMatrix"},
                                {"texture", "gl_TextureMatrix"}};
 
-/// GLSL's matrices have Cg's rows as rows; ours have them as columns, so each is the other's transposed.
+/// GLSL's name for a form of a matrix; null where the step names no form. GLSL's matrices have Cg's rows as
+/// rows; ours have them as columns, so each is the other's transposed.
+const char* suffixOf(const std::string& form) {
+    if (form == "inverse")
+        return "InverseTranspose";
+    if (form == "transpose")
+        return "";
+    return form == "invtrans" ? "Inverse" : nullptr;
+}
+
+/// The form stands before the matrix, as in glstate.matrix.inverse.mvp, or after it.
 StateBinding findMatrix(const std::vector<Step>& steps, const TypeTable& types) {
     std::size_t at = 1;
-    std::string suffix = "Transpose";
-    if (at < steps.size() && steps[at].name == "inverse") {
-        suffix = "InverseTranspose";
-        ++at;
-    } else if (at < steps.size() && steps[at].name == "transpose") {
-        suffix = "";
-        ++at;
-    } else if (at < steps.size() && steps[at].name == "invtrans") {
-        suffix = "Inverse";
-        ++at;
-    }
+    const char* suffix = nullptr;
+    const auto takeForm = [&] {
+        if (!suffix && at < steps.size() && (suffix = suffixOf(steps[at].name)) != nullptr)
+            ++at;
+    };
+    takeForm();
     StateBinding binding;
     for (const Matrix& matrix : MATRICES) {
         if (at >= steps.size() || steps[at].name != matrix.name)
             continue;
-        binding.form = matrix.glsl + suffix;
-        if (steps[at].name == "texture")
-            binding.form += "[" + (steps[at].index.empty() ? "0" : steps[at].index) + "]";
-        binding.type = types.matrix(Scalar::FLOAT, 4, 4);
+        const std::string index = steps[at].index.empty() ? "0" : steps[at].index;
         ++at;
+        takeForm();
+        binding.form = std::string(matrix.glsl) + (suffix ? suffix : "Transpose");
+        if (std::string(matrix.name) == "texture")
+            binding.form += "[" + index + "]";
+        binding.type = types.matrix(Scalar::FLOAT, 4, 4);
         break;
     }
     if (binding.type && at < steps.size() && steps[at].name == "row" && !steps[at].index.empty() &&
