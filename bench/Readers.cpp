@@ -255,21 +255,24 @@ void addReader(const std::string& group, Texture& texture, const Work& limit, co
     addRow(group + "/reader", bytes, reader);
 }
 
+std::string rowGroup(const std::string& format, bool isHalf, const std::string& size) {
+    return format + (isHalf ? "-half/" : "-8bit/") + size;
+}
+
 void addReaders(Subject& subject) {
-    const std::string size =
-        '/' + std::to_string(subject.bytes.getWidth()) + 'x' + std::to_string(subject.bytes.getHeight());
+    std::string size = std::to_string(subject.bytes.getWidth());
+    size.append("x").append(std::to_string(subject.bytes.getHeight()));
     for (const bool isHalf : {false, true}) {
         Texture* const texture = isHalf ? &subject.halves : &subject.bytes;
         const Rows rows = Subject::rowsOf(*texture);
-        const std::string form = isHalf ? "-half" : "-8bit";
         addReader(
-            "ppm" + form + size, *texture,
+            rowGroup("ppm", isHalf, size), *texture,
             [=, path = subject.pictures.ppm()] {
                 readPpmBare(path, rows, isHalf ? rgbToHalfRgba : rgbToRgba, isHalf ? 8 : 4);
             },
             [=, path = subject.pictures.ppm()] { fillTextureFromPpmFile(path, texture, 0, 2, 0, isHalf); });
         addReader(
-            "png" + form + size, *texture,
+            rowGroup("png", isHalf, size), *texture,
             [=, path = subject.pictures.png()] { readPngBare(path, rows, isHalf); },
             [=, path = subject.pictures.png()] { fillTextureFromPngFile(path, texture, 0, 2, 0, isHalf); });
     }

@@ -267,7 +267,7 @@ int64_t peakMemory(Work work) {
 TEST(PictureFiles, CompressedTextsAreNotUnfolded) {
     Bytes text = bytesOf("Comment");
     text.resize(text.size() + 2); // end of the keyword, compression method
-    const Bytes unfolded(7000000);
+    const Bytes unfolded(7000000, 'x');
     uLongf size = compressBound(unfolded.size());
     const size_t start = text.size();
     text.resize(start + size);

@@ -57,7 +57,7 @@ Bytes expectedMemory(const PngPicture& picture, const GuardedTexture& guarded, u
 
 std::vector<PngPicture> everyKindOfPicture() {
     std::vector<PngPicture> pictures;
-    for (const auto& [width, height] : {std::pair{13U, 11U}, {1U, 1U}, {40U, 3U}}) {
+    for (const auto& [width, height] : {std::pair{13U, 11U}, {1U, 9U}, {40U, 3U}}) {
         for (const int colourType : {RGB, RGB_ALPHA}) {
             for (const int bitDepth : {8, 16}) {
                 for (const bool isAdam7 : {false, true}) {
@@ -215,6 +215,24 @@ TEST_F(PngFiles, NoDamagedByteMakesTheFillWritePastTheBuffer) {
             }
         }
     }
+}
+
+TEST_F(PngFiles, PicturesOfOtherProgramsShowWhatTheirPpmShows) {
+    const std::string folder = FWZEL_TEST_PICTURES;
+    const auto read = [&folder](const std::string& name) {
+        uint32_t width = 0;
+        uint32_t height = 0;
+        uint32_t bytes = 0;
+        EXPECT_EQ(VideoTestImage::getWidthHeightFromFile(folder + name, &width, &height, &bytes), 0);
+        GuardedTexture guarded(argsOf(width, height));
+        VideoTestImage::fillTextureFile(folder + name, &guarded.texture, 0, 2, 0, false);
+        return guarded.memory();
+    };
+    const Bytes ridge = read("ridge.ppm");
+    EXPECT_EQ(ridge.size(), 4 * 23 * 15 + 2 * GuardedTexture::GUARD_BYTES);
+    EXPECT_EQ(read("ridge-netpbm-adam7.png"), ridge);
+    EXPECT_EQ(read("ridge-imagemagick-16bit-adam7.png"), ridge);
+    EXPECT_EQ(read("ridge-imagemagick-alpha.png"), ridge);
 }
 
 TEST_F(PngFiles, NullBufferAndOtherComponentSizesAreLeftAlone) {

@@ -42,7 +42,7 @@ struct Form {
 };
 
 constexpr Form EVERY_FORM[] = {{1, false, 0},  {1, true, 0},  {1, false, 1}, {1, false, 8},
-                               {1, false, 32}, {2, false, 0}, {2, false, 3}, {2, false, 0xFFFFFFFF},
+                               {1, false, 32}, {2, false, 0}, {2, false, 7}, {2, false, 0xFFFFFFFF},
                                {2, true, 0},   {2, true, 5}};
 
 uint32_t shifted(uint32_t sample, uint64_t shift) {

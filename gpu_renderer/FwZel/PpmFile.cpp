@@ -43,7 +43,8 @@ File openFile(const std::string& fileName) {
     std::exit(1); // NOLINT(concurrency-mt-unsafe): the documented end of a stream error
 }
 
-// Reads up to the delimiter or the end of the file. LINE_TOO_LONG: the line is full and its rest unread.
+// Reads up to the delimiter or the end of the file. LINE_TOO_LONG: the line is full; one character
+// more has been read, which is not the last of it.
 ReadResult readLine(FILE* fp, char* line, char delimiter) {
     size_t length = 0;
     line[0] = '\0';
@@ -56,7 +57,6 @@ ReadResult readLine(FILE* fp, char* line, char delimiter) {
             continue;
         }
         if (length == LINE_CHARS - 1) {
-            std::ungetc(c, fp);
             return LINE_TOO_LONG;
         }
         line[length] = static_cast<char>(c);
@@ -177,10 +177,9 @@ class PixelWriter {
 public:
     PixelWriter(uint32_t bytesPerColour, bool isFp16, uint32_t shift)
         : mExpansion(bestRowExpansion()), mForm(formOf(bytesPerColour, isFp16, shift)) {
-        const uint32_t bits = 8 * bytesPerColour;
-        const uint64_t left = uint64_t{shift} + (bits - 8);
+        const uint64_t left = uint64_t{shift} + 8 * (bytesPerColour - 1);
         for (uint32_t sample = 0; sample < mShifted.size(); ++sample) {
-            mShifted[sample] = left < bits ? static_cast<uint16_t>(sample << left) : uint16_t{0};
+            mShifted[sample] = left < 16 ? static_cast<uint16_t>(sample << left) : uint16_t{0};
         }
     }
 
@@ -279,7 +278,7 @@ void fillTextureFromPpmFile(std::string filename, Texture* tex, uint32_t texBufI
     const File file = openFile(filename);
     PPMHeader header;
     if (!file || !isHeaderAccepted(file.get(), &header) || header.width != tex->getWidth() ||
-        !hasPixels(header) || !isSizeAccepted(header)) {
+        !isSizeAccepted(header)) {
         return;
     }
     const FieldRows field = tex->getIsInterlaced() ? fieldRows(fid) : WHOLE_FRAME;

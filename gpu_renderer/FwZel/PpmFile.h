@@ -36,8 +36,8 @@ FWZEL_API int getWidthHeightFromPpmFile(std::string fname, uint32_t* width, uint
 /// Pixels missing at the end of a short file read as 0 (opaque black). Texture rows for which the file's
 /// header promises none are left alone.
 ///
-/// Nothing is written when getWidthHeightFromPpmFile() refuses the file, its width is not the texture's or is
-/// 0, width x height x 4 reaches 2 GiB, memory for reading is missing, the host buffer is null, or the host
+/// Nothing is written when getWidthHeightFromPpmFile() refuses the file, its width is not the texture's,
+/// width x height x 4 reaches 2 GiB, memory for reading is missing, the host buffer is null, or the host
 /// buffer is too small for four components to a pixel (fewer components, a pitch shorter than the width).
 /// @param texBufIndex  buffer, reduced by the texture
 /// @param fid          of an interlaced texture 0: file rows 0, 2, 4 …, 1: file rows 1, 3, 5 …; any other,
