@@ -146,7 +146,7 @@ bool isClosing(TokenKind kind) {
 } // namespace
 
 ExpressionParser::ExpressionParser(const std::vector<Token>& tokens, Arena& arena, Diagnostics& diagnostics)
-    : mTokens(tokens), mArena(arena), mDiagnostics(diagnostics) {}
+    : mTokens(tokens), mArena(arena), mDiagnostics(diagnostics), mTypes(arena), mScopes(mTypes) {}
 
 ExpressionParser::Level::Level(ExpressionParser& parser) : mParser(parser) {
     if (parser.mLevels == MAX_LEVELS) {

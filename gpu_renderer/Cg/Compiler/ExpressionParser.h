@@ -4,6 +4,7 @@
 #include <Cg/Compiler/NameScopes.h>
 #include <Cg/Compiler/SyntaxTree.h>
 #include <Cg/Compiler/Token.h>
+#include <Cg/Compiler/Types.h>
 
 #include <cstddef>
 #include <string>
@@ -80,6 +81,7 @@ protected:
     const std::vector<Token>& mTokens;
     Arena& mArena;
     Diagnostics& mDiagnostics;
+    TypeTable mTypes;
     NameScopes mScopes;
     std::size_t mAt = 0;
 

@@ -8,10 +8,15 @@
 
 namespace cg {
 
+class TypeTable;
+
 /// Which names are types, at the place that the parser has reached. The grammar depends on nothing else: any
 /// name that the program declares as a variable or a function is that, even `texture` or `vec2`.
 class NameScopes {
 public:
+    /// @param types  knows the types that the language has
+    explicit NameScopes(const TypeTable& types) : mTypes(types) {}
+
     /// Opens a scope for as long as it lives.
     class Scope {
     public:
@@ -37,6 +42,8 @@ private:
     void declare(std::string_view name, bool isType);
     void forgetFrom(std::size_t start);
 
+    const TypeTable& mTypes;
+    mutable std::unordered_map<std::string_view, bool> mBuiltIn;       ///< answers of mTypes so far
     std::unordered_map<std::string_view, std::vector<bool>> mMeanings; ///< true for a type, innermost last
     std::vector<std::string_view> mDeclared;                           ///< in their order
 };
