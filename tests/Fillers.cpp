@@ -268,6 +268,34 @@ TEST(Fillers, FlatColoursFillTheirRowsAndNothingElse) {
     }
 }
 
+/// FNV-1a, 64 bits.
+uint64_t digestOf(const std::vector<unsigned char>& bytes, uint64_t digest = 0xCBF29CE484222325) {
+    for (const unsigned char byte : bytes)
+        digest = (digest ^ byte) * 0x100000001B3;
+    return digest;
+}
+
+TEST(Fillers, WholePicturesAreWhatTheyWereWhenFirstLookedAt) {
+    constexpr uint64_t DIGESTS[22] = {
+        0xD5E38AF81C48D481, 0xB904A26DFF3A2639, 0xB2EE56A457DAB9A5, 0x7724280579012275, 0x36CDCA23D9E76CE5,
+        0x07BD298DBB9BDCF5, 0xCC12319193ADD039, 0xFCB11AB840CD3139, 0x2EA0A95B577880C5, 0x4625B490382C8AA1,
+        0xD7CD887D24001975, 0x969E1A6793FC8A25, 0xCADDDB47CFB99425, 0x4904E86421159979, 0x61D75498A93C837A,
+        0xA6925E037D175031, 0xA24E730CB0E839E5, 0x39AF3F3798004525, 0x6BE07E97DAAC8B85, 0x3A6231D4F85749E1,
+        0xBC832EA48B536B25, 0xD8D518572089DD25};
+    for (uint32_t pattern = 0; pattern < 22; ++pattern) {
+        std::vector<unsigned char> frame(1920 * 1080 * 4);
+        std::vector<unsigned char> field(960 * 270 * 8);
+        std::vector<unsigned char> plane(960 * 270 * 4);
+        Image::fillTestPattern(frame.data(), Image::COL_ARGB, 1920, 1080, 1920, pattern, 2, 0, 0, 1920, 1080,
+                               false);
+        Image::fillTestPattern(field.data(), Image::COL_RGBA, 960, 270, 960, pattern, 1, 0, 0, 960, 270,
+                               true);
+        Image::fillTestPatternPlanar(plane.data(), 960, 270, 960, pattern, 0, 0, 4, 0, 0, 960, 270);
+        const uint64_t digest = digestOf(plane, digestOf(field, digestOf(frame)));
+        EXPECT_EQ(digest, DIGESTS[pattern]) << "pattern " << pattern << ": 0x" << std::hex << digest;
+    }
+}
+
 INSTANTIATE_TEST_SUITE_P(EveryPattern, PatternFillers, testing::Range(0U, 23U));
 
 } // namespace
