@@ -3,6 +3,7 @@
 // of libpng; for half floats with the conversion of each row.
 
 #include "BenchmarkRow.h"
+#include "CameraPictures.h"
 
 #include <FwZel/PngFile.h>
 #include <FwZel/PpmFile.h>
@@ -10,9 +11,6 @@
 #include <FwZel/VideoTestImage.h>
 
 #include <HeadlessContext.h>
-#include <OutputFile.h>
-#include <PngWriter.h>
-#include <PpmWriter.h>
 
 #include <benchmark/benchmark.h>
 
@@ -32,7 +30,6 @@
 #include <cstdio>
 #include <cstdlib>
 #include <cstring>
-#include <filesystem>
 #include <iostream>
 #include <memory>
 #include <stdexcept>
@@ -178,43 +175,7 @@ void readPngBare(const std::string& path, const Rows& to, bool isHalf) {
     std::fclose(file);
 }
 
-// --- The pictures: a ramp under noise of two bits, as from a camera
-
-class Pictures {
-public:
-    Pictures(uint32_t width, uint32_t height) {
-        std::string folder = (std::filesystem::temp_directory_path() / "fwzel-bench-XXXXXX").string();
-        if (mkdtemp(folder.data()) == nullptr)
-            fail("no temporary folder " + folder);
-        mFolder = folder;
-        std::vector<unsigned char> pixels(size_t{4} * width * height);
-        uint32_t noise = 1;
-        for (size_t i = 0; i < pixels.size(); ++i) {
-            noise = noise * 1664525 + 1013904223;
-            const size_t ramp = i / 4 % width * 250 / width;
-            pixels[i] = static_cast<unsigned char>(ramp + (noise >> 30));
-        }
-        const host::PictureView view = {pixels.data(), width, height, size_t{4} * width};
-        host::OutputFile pngFile(png());
-        host::writePng(pngFile, view, host::PngPixel::RGBA8);
-        pngFile.close();
-        host::OutputFile ppmFile(ppm());
-        host::writePpm(ppmFile, view);
-        ppmFile.close();
-    }
-    ~Pictures() {
-        std::error_code ignored;
-        std::filesystem::remove_all(mFolder, ignored);
-    }
-    Pictures(const Pictures&) = delete;
-    Pictures& operator=(const Pictures&) = delete;
-
-    std::string png() const { return mFolder + "/picture.png"; }
-    std::string ppm() const { return mFolder + "/picture.ppm"; }
-
-private:
-    std::string mFolder;
-};
+// --- The pictures and the textures that take them
 
 /// The pictures of one size and the textures that take them.
 struct Subject {
@@ -235,7 +196,7 @@ struct Subject {
         return {texture.getAddress(0), texture.getWidth(), texture.getHeight(), texture.getPitch()};
     }
 
-    Pictures pictures;
+    CameraPictures pictures;
     Texture bytes, halves;
 };
 

@@ -2,6 +2,7 @@
 // no more.
 
 #include "BenchmarkRow.h"
+#include "CameraPictures.h"
 
 #include <FwZel/Texture.h>
 #include <FwZel/VideoTestImage.h>
@@ -84,6 +85,20 @@ void addConstruction(const Size& size, const Format& format) {
     addCompared(
         "construction", size, format, [=] { constructByHand(size, format); },
         [=] { const Texture texture(VideoTestImage::COLOUR_BAR_75, argsOf(size, format)); });
+}
+
+/// The same fresh buffer, filled by the reader alone.
+void addFileConstruction(const Size& size, const Format& format) {
+    const auto pictures = std::make_shared<CameraPictures>(size.width, size.height);
+    for (const std::string& path : {pictures->png(), pictures->ppm()})
+        addCompared(
+            "construction-" + path.substr(path.size() - 3), size, format,
+            [=] {
+                Texture texture(VideoTestImage::NO_TEST_PATTERN, argsOf(size, format));
+                VideoTestImage::fillTextureFile(path, &texture, 0, 2, 0, format.isHalf);
+            },
+            // The pictures stay as long as the row.
+            [=, kept = pictures] { const Texture texture(path, argsOf(size, format)); });
 }
 
 void addUploads(const Size& size, const Format& format) {
@@ -179,6 +194,7 @@ int main(int argc, char** argv) {
     for (const Size& size : SIZES)
         for (const Format& format : FORMATS) {
             addConstruction(size, format);
+            addFileConstruction(size, format);
             addUploads(size, format);
             addReadback(size, format);
         }
