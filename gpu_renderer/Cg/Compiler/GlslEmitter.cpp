@@ -135,7 +135,7 @@ std::string GlslEmitter::emit() {
     return text + functions + entry;
 }
 
-// ------------------------------------------------------------------------------------------------ names
+// ----------------------------------------------------------------------------------------------- names
 
 void GlslEmitter::nameGlobals() {
     for (const StageDeclaration& declaration : mInterface.declarations())
@@ -233,8 +233,7 @@ std::string GlslEmitter::declare(const Type* type, const std::string& name) {
     return text;
 }
 
-// ------------------------------------------------------------------------------------------------
-// declarations
+// ---------------------------------------------------------------------------------------- declarations
 
 void GlslEmitter::structDefinition(const Type* type, std::string& text,
                                    std::unordered_set<const Type*>& done) {
@@ -362,6 +361,12 @@ std::string GlslEmitter::output(const StageValue& value) {
                              : slot.glsl + " = " + slot.twin + " = " + text + ";";
 }
 
+bool GlslEmitter::isOnlyOutput(const Variable* argument) const {
+    return std::none_of(mProgram.values.begin(), mProgram.values.end(), [argument](const StageValue& value) {
+        return !value.isOutput && rootVariable(value.place) == argument;
+    });
+}
+
 std::string GlslEmitter::mainFunction() {
     mText.clear();
     mNames.openScope();
@@ -374,10 +379,16 @@ std::string GlslEmitter::mainFunction() {
         if (mVariableNames.count(variable) != 0 && variable->initializer && !variable->isConstantExpression)
             line(variableName(variable) + " = " + print(variable->initializer, ASSIGN_LEVEL) + ";");
     for (const Variable* variable : mProgram.arguments)
-        line(declare(variable->type, variableName(variable)) + ";");
-    for (const StageValue& value : mProgram.values)
-        if (!value.isOutput)
-            line(print(value.place, POSTFIX_LEVEL) + " = " + input(value) + ";");
+        if (!variable->type->isScalarOrVector() || isOnlyOutput(variable))
+            line(declare(variable->type, variableName(variable)) + ";");
+    for (const StageValue& value : mProgram.values) {
+        if (value.isOutput)
+            continue;
+        const std::string place = value.place->kind == Kind::VARIABLE && value.place->type->isScalarOrVector()
+                                      ? declare(value.place->type, variableName(value.place->variable))
+                                      : print(value.place, POSTFIX_LEVEL);
+        line(place + " = " + input(value) + ";");
+    }
     std::string call = functionName(mProgram.entry) + "(";
     for (const Variable* variable : mProgram.arguments)
         call += (variable == mProgram.arguments[0] ? "" : ", ") + variableName(variable);
@@ -394,7 +405,7 @@ std::string GlslEmitter::mainFunction() {
     return std::move(mText);
 }
 
-// ------------------------------------------------------------------------------------------------ statements
+// ------------------------------------------------------------------------------------------ statements
 
 void GlslEmitter::line(const std::string& text) {
     if (!text.empty())
@@ -546,8 +557,7 @@ void GlslEmitter::forLoop(const TypedStmt* stmt) {
     mNames.closeScope();
 }
 
-// ------------------------------------------------------------------------------------------------
-// expressions
+// ----------------------------------------------------------------------------------------- expressions
 
 std::string GlslEmitter::print(const TypedExpr* expression, int minimum) {
     int precedence = POSTFIX_LEVEL;

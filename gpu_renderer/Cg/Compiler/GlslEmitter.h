@@ -63,6 +63,7 @@ private:
     const std::string& functionName(const Function* function);
     const std::string& structName(const Type* type);
 
+    bool isOnlyOutput(const Variable* argument) const;
     std::string input(const StageValue& value);
     std::string output(const StageValue& value);
 

@@ -55,6 +55,8 @@ void References::visit(const TypedExpr* expression) {
                 visit(part->operands[1]);
         return;
     }
+    if (expression->kind == TypedExpr::Kind::BUILTIN && expression->variable)
+        note(expression->variable, "");
     for (const TypedExpr* operand : expression->operands)
         visit(operand);
 }

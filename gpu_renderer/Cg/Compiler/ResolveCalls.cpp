@@ -62,7 +62,7 @@ std::string listTypes(const std::vector<TypedExpr*>& arguments) {
 
 } // namespace
 
-// ------------------------------------------------------------------------------------------------ choice
+// ---------------------------------------------------------------------------------------------- choice
 
 TypedExpr* Resolver::call(const CallExpr* expr) {
     std::vector<TypedExpr*> arguments;
@@ -244,7 +244,7 @@ const FunctionDecl* Resolver::choose(SourceLocation at, Name name,
     return nullptr;
 }
 
-// ------------------------------------------------------------------------------------------------ methods
+// --------------------------------------------------------------------------------------------- methods
 
 const FunctionDecl* Resolver::findMethod(const Type* type, Name name,
                                          std::vector<const FunctionDecl*>& methods) {
@@ -276,7 +276,7 @@ TypedExpr* Resolver::methodCall(SourceLocation at, TypedExpr* object, Name name,
     return method ? callFunction(at, method, arguments, object) : nullptr;
 }
 
-// ------------------------------------------------------------------------------------------------ instances
+// ------------------------------------------------------------------------------------------- instances
 
 const FunctionDecl* Resolver::definitionOf(const FunctionDecl* declaration) {
     if (declaration->body)
@@ -360,7 +360,7 @@ void Resolver::resolveBody(Function* function, const FunctionDecl* definition,
     function->body = block(definition->body);
 }
 
-// ------------------------------------------------------------------------------------------------ calls
+// ----------------------------------------------------------------------------------------------- calls
 
 /// Prepares one argument: converted, and by way of a temporary where GLSL could not write back to it.
 TypedExpr* Resolver::passArgument(TypedExpr* argument, const Type* type, Direction direction,
@@ -533,8 +533,7 @@ TypedExpr* Resolver::withKnownSampler(TypedExpr* call) {
     return call;
 }
 
-// ------------------------------------------------------------------------------------------------ built-in
-// functions
+// ---------------------------------------------------------------------------------- built-in functions
 
 namespace {
 

@@ -5,6 +5,7 @@
 #include <Cg/Compiler/StateBindings.h>
 
 #include <algorithm>
+#include <cctype>
 #include <string>
 
 namespace cg {
@@ -13,6 +14,13 @@ namespace {
 
 constexpr int MAX_ARRAY_LENGTH = 65536;
 constexpr int MAX_LEAVES = 1 << 18; ///< components of one variable
+
+std::string upper(Name text) {
+    std::string result(text);
+    for (char& c : result)
+        c = static_cast<char>(std::toupper(static_cast<unsigned char>(c)));
+    return result;
+}
 
 } // namespace
 
@@ -72,7 +80,7 @@ void Resolver::collectDefinition(const TypeSyntax* type) {
         mStructDecls.emplace(type->definition->name, type->definition);
 }
 
-// ------------------------------------------------------------------------------------------------ types
+// ----------------------------------------------------------------------------------------------- types
 
 const Type* Resolver::findType(Name name) {
     for (auto it = mContext.scope.rbegin(); it != mContext.scope.rend(); ++it)
@@ -196,7 +204,7 @@ bool Resolver::implements(const Type* type, const Type* interface) const {
            type->structure->interface == interface->structure->declaration;
 }
 
-// ------------------------------------------------------------------------------------------------ globals
+// --------------------------------------------------------------------------------------------- globals
 
 Variable* Resolver::makeVariable(Variable::Storage storage, Name name, const Type* type,
                                  const VariableDecl* declaration) {
@@ -260,15 +268,7 @@ void Resolver::resolveGlobal(Variable* variable, const VariableDecl* declaration
         (!qualifiers.isStatic && !(qualifiers.isConst && value) && (!value || constantValue(value)));
     if (isUniform) {
         variable->storage = Variable::Storage::UNIFORM;
-        const std::string semantic(declaration->semantic.name);
-        for (const char* prefix : {"state.", "STATE.", "glstate."})
-            if (semantic.rfind(prefix, 0) == 0) {
-                const StateBinding state = findState(semantic.substr(semantic.find('.') + 1), mTypes);
-                if (state.type && mBuild.cost(mBuild.zero(declaration->location, state.type), type) !=
-                                      TypedBuilder::IMPOSSIBLE)
-                    variable->state = mBuild.convert(
-                        mBuild.builtin(declaration->location, state.type, mArena.keep(state.form), {}), type);
-            }
+        bindState(variable);
         mProgram->uniforms.push_back(variable);
         return;
     }
@@ -277,8 +277,24 @@ void Resolver::resolveGlobal(Variable* variable, const VariableDecl* declaration
     mProgram->globals.push_back(variable);
 }
 
-// ------------------------------------------------------------------------------------------------
-// initializers
+/// A uniform whose semantic names a piece of OpenGL's own state stands for that.
+void Resolver::bindState(Variable* variable) {
+    const SourceLocation at = variable->declaration->location;
+    const std::string semantic(variable->declaration->semantic.name);
+    const std::size_t point = semantic.find('.');
+    const std::string root = upper(Name(semantic).substr(0, point));
+    if (point == std::string::npos || (root != "STATE" && root != "GLSTATE"))
+        return;
+    const StateBinding state = findState(semantic.substr(point + 1), mTypes);
+    if (!state.type)
+        return;
+    TypedExpr* value = mBuild.builtin(at, state.type, mArena.keep(state.form), {});
+    value->variable = variable;
+    if (mBuild.cost(value, variable->type) != TypedBuilder::IMPOSSIBLE)
+        variable->state = mBuild.convert(value, variable->type);
+}
+
+// ---------------------------------------------------------------------------------------- initializers
 
 /// @param type  an unsized array gets its length here
 TypedExpr* Resolver::initializer(const Type*& type, const Expr* expr) {
@@ -441,16 +457,9 @@ TypedExpr* Resolver::fillNumber(const Type* type, ListCursor& cursor) {
     return mBuild.construct(at, type, parts);
 }
 
-// ------------------------------------------------------------------------------------------------ the entry
+// ------------------------------------------------------------------------------------------- the entry
 
 namespace {
-
-std::string upper(Name text) {
-    std::string result(text);
-    for (char& c : result)
-        c = static_cast<char>(std::toupper(static_cast<unsigned char>(c)));
-    return result;
-}
 
 /// TEXCOORD1 + 2 = TEXCOORD3; a semantic without a number counts from 0.
 std::string numbered(const std::string& semantic, int offset) {
@@ -551,6 +560,7 @@ void Resolver::resolveEntry(const FunctionDecl* declaration) {
             listed.isUniform = false;
             Variable* inner = makeVariable(Variable::Storage::PARAMETER, parameter->name, type, parameter);
             inner->direction = listed.direction;
+            inner->isConst = parameter->qualifiers.isConst && listed.direction == Direction::IN;
             function->parameters.push_back(inner);
             mContext.scope.push_back({parameter->name, inner, nullptr});
             listed.variable = makeVariable(Variable::Storage::LOCAL, parameter->name, type, parameter);
@@ -623,6 +633,9 @@ void Resolver::addGlobals() {
             continue;
         const auto* variableDecl = static_cast<const VariableDecl*>(declaration);
         if (mGlobalDecls[variableDecl->name] != variableDecl || variableDecl->qualifiers.isStatic)
+            continue;
+        const Type* named = mTypes.find(variableDecl->type->name);
+        if (named && named->kind == Type::Kind::TEXT)
             continue;
         const Variable* known = globalVariable(variableDecl);
         if (!known || known->storage != Variable::Storage::UNIFORM)

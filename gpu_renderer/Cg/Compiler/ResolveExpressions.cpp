@@ -167,7 +167,7 @@ TypedExpr* Resolver::literal(const LiteralExpr* expr) {
     return nullptr;
 }
 
-// ------------------------------------------------------------------------------------------------ names
+// ----------------------------------------------------------------------------------------------- names
 
 Variable* Resolver::findVariable(Name name) {
     for (auto it = mContext.scope.rbegin(); it != mContext.scope.rend(); ++it)
@@ -235,7 +235,7 @@ TypedExpr* Resolver::nothing(SourceLocation at) {
     return mBuild.literal(at, mTypes.scalar(Scalar::INT), 0);
 }
 
-// ------------------------------------------------------------------------------------------------ members
+// --------------------------------------------------------------------------------------------- members
 
 TypedExpr* Resolver::stateVariable(const Expr* expr) {
     Name root;
@@ -346,8 +346,7 @@ TypedExpr* Resolver::elementOf(SourceLocation at, TypedExpr* object, TypedExpr* 
     return mBuild.element(at, object, index);
 }
 
-// ------------------------------------------------------------------------------------------------
-// construction
+// ---------------------------------------------------------------------------------------- construction
 
 TypedExpr* Resolver::constructor(const ConstructExpr* expr) {
     const Type* type = typeOf(expr->type);
@@ -400,7 +399,7 @@ TypedExpr* Resolver::castExpression(const CastExpr* expr) {
     return mBuild.cast(expr->location, operand, type);
 }
 
-// ------------------------------------------------------------------------------------------------ operators
+// ------------------------------------------------------------------------------------------- operators
 
 /// A value that is needed several times: itself, or a temporary and the assignment to it that comes before.
 TypedExpr* Resolver::once(TypedExpr* value, TypedExpr*& preparation) {
@@ -540,7 +539,7 @@ TypedExpr* Resolver::assignElements(const AssignExpr* expr, const MemberExpr* ta
     return mBuild.comma(at, result, mBuild.variable(at, place->variable));
 }
 
-// ------------------------------------------------------------------------------------------------ samplers
+// -------------------------------------------------------------------------------------------- samplers
 
 namespace {
 

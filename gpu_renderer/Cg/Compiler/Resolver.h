@@ -66,6 +66,7 @@ private:
     const Type* checkSize(SourceLocation at, const Type* type);
     Variable* globalVariable(const VariableDecl* declaration);
     void resolveGlobal(Variable* variable, const VariableDecl* declaration);
+    void bindState(Variable* variable);
     bool implements(const Type* type, const Type* interface) const;
 
     // Initializers

@@ -126,6 +126,8 @@ StageSlot fragmentInput(const NumberedSemantic& semantic) {
         return {"gl_PointCoord", 2, false, ""};
     if (isOneOf(name, {"PRIMITIVEID", "SV_PRIMITIVEID"}))
         return {"gl_PrimitiveID", 1, true, ""};
+    if (isOneOf(name, {"PSIZE", "PSIZ", "POINTSIZE", "CLP", "DEPTH", "DEPR"}))
+        return {"0.0", 1, false, ""}; // in the struct that the stages share, but not handed on
     return {};
 }
 

@@ -97,7 +97,7 @@ Variable* rootVariable(const TypedExpr* expression) {
     }
 }
 
-// ------------------------------------------------------------------------------------------- plain nodes
+// ----------------------------------------------------------------------------------------- plain nodes
 
 TypedExpr* TypedBuilder::make(TypedExpr::Kind kind, SourceLocation at, const Type* type,
                               std::vector<TypedExpr*> operands) {
@@ -181,17 +181,27 @@ TypedExpr* TypedBuilder::swizzle(SourceLocation at, TypedExpr* object, const std
 TypedExpr* TypedBuilder::pick(TypedExpr* constructed, const std::vector<int>& components) {
     if (constructed->kind != Kind::CONSTRUCT || !constructed->type->isVector())
         return nullptr;
+    std::vector<TypedExpr*> parts;
+    const int last = components[0] + static_cast<int>(components.size());
     int first = 0;
+    int wanted = components[0];
     for (TypedExpr* operand : constructed->operands) {
         const int size = operand->type->components();
-        const bool isWhole = static_cast<int>(components.size()) == size && components[0] == first;
-        if (isWhole && components.back() == first + size - 1)
-            return operand;
-        if (components.size() == 1 && components[0] >= first && components[0] < first + size)
-            return isSimple(operand) ? swizzle(operand->location, operand, {components[0] - first}) : nullptr;
-        first += size;
+        const int end = first + size;
+        if (wanted < end && wanted < last) {
+            const bool isWhole = wanted == first && end <= last;
+            if (!isWhole && !isSimple(operand))
+                return nullptr;
+            std::vector<int> inner;
+            for (int component = wanted; component < std::min(end, last); ++component)
+                inner.push_back(component - first);
+            parts.push_back(isWhole ? operand : swizzle(operand->location, operand, inner));
+            wanted = end;
+        }
+        first = end;
     }
-    return nullptr;
+    const Type* type = mTypes.vector(constructed->type->scalar, static_cast<int>(components.size()));
+    return parts.size() == 1 ? parts[0] : make(Kind::CONSTRUCT, constructed->location, type, parts);
 }
 
 TypedExpr* TypedBuilder::assign(SourceLocation at, TypedExpr* target, TypedExpr* value) {
@@ -229,7 +239,7 @@ TypedExpr* TypedBuilder::zero(SourceLocation at, const Type* type) {
     return expression;
 }
 
-// ------------------------------------------------------------------------------------------- conversions
+// ----------------------------------------------------------------------------------------- conversions
 
 int TypedBuilder::cost(const TypedExpr* from, const Type* to) const {
     const Type* type = from->type;
@@ -644,7 +654,7 @@ TypedExpr* TypedBuilder::conditional(SourceLocation at, TypedExpr* condition, Ty
     return builtin(at, result, "cg_select($2, $0, $1)", {whenTrue, whenFalse, condition}, "cg_select");
 }
 
-// ------------------------------------------------------------------------------------------- products
+// -------------------------------------------------------------------------------------------- products
 
 TypedExpr* TypedBuilder::product(SourceLocation at, TypedExpr* left, TypedExpr* right) {
     if (!left->type->isNumeric() || !right->type->isNumeric()) {

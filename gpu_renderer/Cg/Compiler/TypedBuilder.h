@@ -31,8 +31,8 @@ public:
     TypedExpr* element(SourceLocation at, TypedExpr* object, int index);
     TypedExpr* swizzle(SourceLocation at, TypedExpr* object, const std::vector<int>& components);
 
-    /// Components of a constructor's arguments where they can be had without the constructor: `uv` of
-    /// `float4(uv, 0, 0)`; else null.
+    /// Some components, one after another, of what a constructor makes, where they can be had without it:
+    /// `uv` of `float4(uv, 0, 0)`; else null.
     TypedExpr* pick(TypedExpr* constructed, const std::vector<int>& components);
     TypedExpr* assign(SourceLocation at, TypedExpr* target, TypedExpr* value);
     TypedExpr* comma(SourceLocation at, TypedExpr* first, TypedExpr* second);

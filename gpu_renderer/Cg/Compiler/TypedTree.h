@@ -72,7 +72,7 @@ struct TypedExpr {
     const Type* type;
     std::vector<TypedExpr*> operands;
     double number = 0;
-    Variable* variable = nullptr;
+    Variable* variable = nullptr; ///< BUILTIN: the uniform that is bound to this piece of OpenGL's state
     Function* function = nullptr;
     Name form;   ///< BUILTIN
     Name helper; ///< BUILTIN: name of the helper function that the form needs

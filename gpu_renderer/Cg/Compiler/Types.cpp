@@ -140,7 +140,9 @@ const Type* TypeTable::withScalar(const Type* type, Scalar scalar) const {
 const Type* TypeTable::find(Name name) const {
     if (name == "void")
         return mVoid;
-    if (name == "string")
+    // Texts and the textures of effect files are named by programs and used by none.
+    if (name == "string" || name == "texture" || name == "texture1D" || name == "texture2D" ||
+        name == "texture3D" || name == "textureCUBE" || name == "textureRECT")
         return mText;
     for (const auto& [prefix, scalar] : SCALAR_NAMES) {
         if (!startsWith(name, prefix))

@@ -1,0 +1,254 @@
+#include <Cg/Compiler/Compiler.h>
+
+#include <gtest/gtest.h>
+
+#include <sys/wait.h>
+
+#include <algorithm>
+#include <array>
+#include <cstdio>
+#include <filesystem>
+#include <fstream>
+#include <sstream>
+#include <string>
+#include <string_view>
+#include <tuple>
+#include <vector>
+
+// Programs are data: every file under tests/cg/ names its entries in lines `//! vertex NAME` and
+// `//! fragment NAME`. Those in tests/cg/errors/ also name, at the end of a line, what is to be said about
+// it:
+// `//! error TEXT` or `//! warning TEXT`.
+
+namespace {
+
+namespace fs = std::filesystem;
+
+std::string textOf(const fs::path& path) {
+    std::ifstream file(path, std::ios::binary);
+    std::ostringstream text;
+    text << file.rdbuf();
+    return text.str();
+}
+
+struct Entry {
+    cg::Stage stage;
+    std::string name;
+};
+
+std::vector<Entry> entriesOf(const std::string& program) {
+    std::vector<Entry> entries;
+    std::istringstream lines(program);
+    for (std::string line; std::getline(lines, line);) {
+        std::istringstream words(line);
+        std::string mark;
+        std::string stage;
+        std::string name;
+        words >> mark >> stage >> name;
+        if (mark == "//!" && (stage == "vertex" || stage == "fragment"))
+            entries.push_back({stage == "vertex" ? cg::Stage::VERTEX : cg::Stage::FRAGMENT, name});
+    }
+    return entries;
+}
+
+cg::CompileResult compile(const std::string& source, const std::string& fileName, const Entry& entry) {
+    cg::CompileRequest request;
+    request.source = source;
+    request.fileName = fileName;
+    request.entry = entry.name;
+    request.stage = entry.stage;
+    request.reader = [](const std::string& path, std::string& text) {
+        if (!fs::is_regular_file(path))
+            return false;
+        text = textOf(path);
+        return true;
+    };
+    return cg::compile(request);
+}
+
+cg::CompileResult compileFragment(const std::string& source) {
+    return compile(source, "test.cg", {cg::Stage::FRAGMENT, "main"});
+}
+
+/// What glslangValidator finds wrong with a shader; empty where it is right and where there is no judge.
+std::string verdict(const std::string& glsl, cg::Stage stage) {
+    if (std::string_view(FWZEL_GLSLANG_VALIDATOR).empty())
+        return "";
+    const fs::path file =
+        fs::path(testing::TempDir()) / (stage == cg::Stage::VERTEX ? "judged.vert" : "judged.frag");
+    std::ofstream(file) << glsl;
+    const std::string command = FWZEL_GLSLANG_VALIDATOR " " + file.string();
+    FILE* pipe = popen(command.c_str(), "r");
+    std::string output;
+    std::array<char, 512> part{};
+    while (std::fgets(part.data(), static_cast<int>(part.size()), pipe))
+        output += part.data();
+    return WEXITSTATUS(pclose(pipe)) == 0 ? "" : output;
+}
+
+std::vector<std::string> programsIn(const char* folder) {
+    std::vector<std::string> names;
+    for (const auto& file : fs::directory_iterator(fs::path(FWZEL_CG_PROGRAMS) / folder))
+        if (file.path().extension() == ".cg")
+            names.push_back((fs::path(folder) / file.path().stem()).string());
+    return names;
+}
+
+std::string testName(const testing::TestParamInfo<std::string>& info) {
+    return fs::path(info.param).stem().string();
+}
+
+class CgPrograms : public testing::TestWithParam<std::string> {};
+
+TEST_P(CgPrograms, BecomeGlslThatASecondJudgeTakes) {
+    const fs::path path = fs::path(FWZEL_CG_PROGRAMS) / (GetParam() + ".cg");
+    const std::string source = textOf(path);
+    const std::vector<Entry> entries = entriesOf(source);
+    ASSERT_FALSE(entries.empty());
+    for (const Entry& entry : entries) {
+        const cg::CompileResult result = compile(source, path.string(), entry);
+        ASSERT_TRUE(result.ok) << result.listing;
+        EXPECT_EQ("", verdict(result.glsl, entry.stage)) << result.glsl;
+    }
+}
+
+INSTANTIATE_TEST_SUITE_P(All, CgPrograms, testing::ValuesIn(programsIn("programs")), testName);
+
+/// Line, severity and text of what a listing or a marked program says.
+using Remark = std::tuple<int, std::string, std::string>;
+
+std::vector<Remark> remarksIn(const std::string& listing) {
+    std::vector<Remark> remarks;
+    std::istringstream lines(listing);
+    for (std::string line; std::getline(lines, line);)
+        for (const std::string severity : {"error", "warning"}) {
+            const std::size_t at = line.find(") : " + severity + ": ");
+            if (at == std::string::npos)
+                continue;
+            const int number = std::stoi(line.substr(line.rfind('(', at) + 1));
+            remarks.emplace_back(number, severity, line.substr(at + 6 + severity.size()));
+        }
+    return remarks;
+}
+
+std::vector<Remark> remarksWanted(const std::string& program) {
+    std::vector<Remark> remarks;
+    std::istringstream lines(program);
+    int number = 0;
+    for (std::string line; std::getline(lines, line);) {
+        ++number;
+        for (const std::string severity : {"error", "warning"})
+            if (const std::size_t at = line.find("//! " + severity + " "); at != std::string::npos)
+                remarks.emplace_back(number, severity, line.substr(at + 5 + severity.size()));
+    }
+    return remarks;
+}
+
+class CgErrors : public testing::TestWithParam<std::string> {};
+
+TEST_P(CgErrors, AreSaidInTheLineThatTheyConcern) {
+    const std::string source = textOf(fs::path(FWZEL_CG_PROGRAMS) / (GetParam() + ".cg"));
+    const cg::CompileResult result = compile(source, "test.cg", entriesOf(source).at(0));
+    const std::vector<Remark> wanted = remarksWanted(source);
+    EXPECT_EQ(wanted, remarksIn(result.listing)) << result.listing;
+    const bool isWrong = source.find("//! error") != std::string::npos;
+    EXPECT_EQ(!isWrong, result.ok);
+    EXPECT_EQ(isWrong, result.glsl.empty());
+}
+
+INSTANTIATE_TEST_SUITE_P(All, CgErrors, testing::ValuesIn(programsIn("errors")), testName);
+
+TEST(CgCompiler, NamesTheEntryThatIsMissing) {
+    const cg::CompileResult result = compileFragment("float4 mian() : COLOR { return 0; }");
+    EXPECT_FALSE(result.ok);
+    EXPECT_NE(std::string::npos, result.listing.find("the program has no function 'main'")) << result.listing;
+}
+
+TEST(CgCompiler, ListsTheCandidatesOfACallThatNoneTakes) {
+    const cg::CompileResult result = compileFragment("float f(float2 a, out int b);\n"
+                                                     "float f(sampler2D s);\n"
+                                                     "float4 main() : COLOR { return f(1); }\n");
+    EXPECT_NE(std::string::npos,
+              result.listing.find("test.cg(1) : note: candidate: float f(float2, out int)"))
+        << result.listing;
+    EXPECT_NE(std::string::npos, result.listing.find("candidate: float f(sampler2D)")) << result.listing;
+}
+
+/// "name glslName unit state [defaults]" of all leaves and arrays.
+void describe(const cg::Parameter& parameter, std::vector<std::string>& out) {
+    std::ostringstream text;
+    text << parameter.name << " -> " << parameter.glslName;
+    if (parameter.textureUnit >= 0)
+        text << " unit " << parameter.textureUnit;
+    if (!parameter.stateBinding.empty())
+        text << " is " << parameter.stateBinding;
+    if (!parameter.isReferenced)
+        text << " unused";
+    for (const float value : parameter.defaults)
+        text << ' ' << value;
+    if (parameter.variability == cg::ParameterVariability::VARYING)
+        text << " : " << parameter.semantic;
+    if (parameter.parameterClass != cg::ParameterClass::STRUCT)
+        out.push_back(text.str());
+    for (const cg::Parameter& child : parameter.children)
+        describe(child, out);
+}
+
+std::vector<std::string> parametersOf(const std::string& source) {
+    const cg::CompileResult result = compileFragment(source);
+    EXPECT_TRUE(result.ok) << result.listing;
+    std::vector<std::string> lines;
+    for (const cg::Parameter& parameter : result.parameters)
+        describe(parameter, lines);
+    return lines;
+}
+
+TEST(CgParameters, HaveTheNamesOfTheSourceAndOfTheUniforms) {
+    const std::vector<std::string> wanted = {
+        "uv ->  : TEXCOORD0",
+        "levels.gain -> levels.gain",
+        "levels.map -> levels_map unit 3",
+        "levels.taps -> levels.taps",
+        "levels.taps[0] -> levels.taps[0]",
+        "levels.taps[1] -> levels.taps[1]",
+        "sample -> sample_",
+        "layers -> ",
+        "layers[0].map -> layers_map[0]",
+        "layers[1].map -> layers_map[1]",
+        "grid -> ",
+        "grid[0] -> grid",
+        "grid[0][0] -> grid[0]",
+        "grid[0][1] -> grid[1]",
+        "grid[1] -> ",
+        "grid[1][0] -> grid[2]",
+        "grid[1][1] -> grid[3]",
+        "mvp ->  is state.matrix.mvp",
+        "return ->  : COLOR",
+        "unused ->  unused",
+    };
+    EXPECT_EQ(wanted,
+              parametersOf("struct Levels { float gain; sampler2D map : TEXUNIT3; float2 taps[2]; };\n"
+                           "struct Layer { sampler2D map; };\n"
+                           "float unused;\n"
+                           "float4 main(float2 uv : TEXCOORD0, uniform Levels levels, uniform float sample,\n"
+                           "            Layer layers[2], uniform float grid[2][2],\n"
+                           "            uniform float4x4 mvp : state.matrix.mvp) : COLOR {\n"
+                           "  return tex2D(levels.map, uv * levels.taps[1]) * levels.gain * sample\n"
+                           "    + tex2D(layers[1].map, uv) + grid[1][0] + mvp[0]; }\n"));
+}
+
+TEST(CgParameters, HaveTheirDefaultValuesRowByRow) {
+    const std::vector<std::string> wanted = {
+        "return ->  : COLOR", "gain ->  unused 0.5",    "lift ->  unused 1 2 3",  "m ->  unused 1 2 3 4 5 6",
+        "taps ->  unused",    "taps[0] ->  unused 1 2", "taps[1] ->  unused 3 4", "p.a ->  unused 2",
+        "p.b ->  unused 4 4", "on ->  unused 1",        "gamma ->  unused 0.25",
+    };
+    EXPECT_EQ(wanted, parametersOf("struct P { float a; float2 b; };\n"
+                                   "float gain = 1.0 / 2; uniform half3 lift = half3(1, 2, 3);\n"
+                                   "float2x3 m = { {1, 2, 3}, {4, 5, 6} }; float2 taps[2] = { 1, 2, 3, 4 };\n"
+                                   "P p = { 2, float2(4) }; bool on = true; const float two = sqrt(4);\n"
+                                   "uniform float gamma = pow(two, -2);\n"
+                                   "float4 main() : COLOR { return 1; }\n"));
+}
+
+} // namespace
