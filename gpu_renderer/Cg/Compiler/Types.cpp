@@ -141,8 +141,7 @@ const Type* TypeTable::find(Name name) const {
     if (name == "void")
         return mVoid;
     // Texts and the textures of effect files are named by programs and used by none.
-    if (name == "string" || name == "texture" || name == "texture1D" || name == "texture2D" ||
-        name == "texture3D" || name == "textureCUBE" || name == "textureRECT")
+    if (name == "string" || name == "texture" || name == "textureCUBE" || name == "textureRECT")
         return mText;
     for (const auto& [prefix, scalar] : SCALAR_NAMES) {
         if (!startsWith(name, prefix))
