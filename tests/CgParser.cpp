@@ -345,7 +345,7 @@ TEST(CgParser, Declarations) {
          "float a = 4\nfloat b = 5"},
         {"sampler2D s = sampler_state { Texture = <t>; MinFilter = Linear; }; samplerRECT r : TEXUNIT1;",
          "sampler2D s\nsamplerRECT r : TEXUNIT1"},
-        {"texture t : DIFFUSE < string n = \"x\"; >; texture2D u; string s = \"x\";", "string s = \"x\""},
+        {"texture t : DIFFUSE < string n = \"x\"; >; texture2D u; string s = \"x\"; float a;", "float a"},
         {"technique T { pass P { VertexProgram = compile vp40 main(); } } technique10 { } float a;",
          "float a"},
         {"interface I { float3 f(float3 n); }; struct S : I { float k; float3 f(float3 n) { return n * k; } "

@@ -14,6 +14,9 @@ namespace {
 
 constexpr Name ASSEMBLY = "asm";
 
+/// A type of the language, but texts have no use outside effect files.
+constexpr Name TEXT_TYPE = "string";
+
 /// Qualifiers that change nothing. They are ordinary names where no type follows.
 bool isEmptyQualifier(Name word) {
     static const std::unordered_set<Name> WORDS{
@@ -107,8 +110,7 @@ private:
             refuseAssembly();
         if (isAtEffectBlock())
             skipEffectBlock();
-        else if (isAt(TokenKind::NAME) && isEffectType(token().text) && isAt(TokenKind::NAME, 1) &&
-                 !mScopes.isType(token().text))
+        else if (isAtEffectObject())
             skipEffectObject();
         else if (isAtWord("interface") && isAt(TokenKind::NAME, 1) && !isAtPromise())
             parseInterface(declarations);
@@ -140,6 +142,13 @@ private:
         if (!isAt(TokenKind::LEFT_BRACE))
             fail("'{' after a technique's name");
         skipBracketed();
+    }
+
+    bool isAtEffectObject() const {
+        if (!isAt(TokenKind::NAME) || !isAt(TokenKind::NAME, 1))
+            return false;
+        const Name word = token().text;
+        return word == TEXT_TYPE || (isEffectType(word) && !mScopes.isType(word));
     }
 
     /// `texture diffuse : DIFFUSE < string name = "brick.png"; >;`
