@@ -554,15 +554,23 @@ Expr* ExpressionParser::parseNumber() {
         literal->type = LiteralExpr::Type::FIXED;
         break;
     }
-    if (number.length == first.text.size())
-        return literal;
-    SourceLocation swizzleAt = first.location;
-    swizzleAt.column += static_cast<std::uint32_t>(number.length + 1);
-    auto* const swizzle = make<MemberExpr>(swizzleAt);
-    swizzle->object = literal;
-    swizzle->name = first.text.substr(number.length + 1);
-    mHeight = 2;
-    return swizzle;
+    return parseGluedSwizzles(first, number.length, literal);
+}
+
+/// `.xxx.y` behind a number, which the lexer takes as a part of it.
+Expr* ExpressionParser::parseGluedSwizzles(const Token& number, std::size_t at, Expr* value) {
+    while (at < number.text.size()) {
+        const std::size_t end = std::min(number.text.find('.', at + 1), number.text.size());
+        SourceLocation swizzleAt = number.location;
+        swizzleAt.column += static_cast<std::uint32_t>(at + 1);
+        auto* const swizzle = make<MemberExpr>(swizzleAt);
+        swizzle->object = value;
+        swizzle->name = number.text.substr(at + 1, end - at - 1);
+        setHeight(mHeight + 1);
+        value = swizzle;
+        at = end;
+    }
+    return value;
 }
 
 // ---------------------------------------------------------------------------------------- initializers

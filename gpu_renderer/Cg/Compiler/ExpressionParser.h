@@ -95,6 +95,7 @@ private:
     Expr* parseIndex(Expr* object);
     Expr* parsePrimary();
     Expr* parseNumber();
+    Expr* parseGluedSwizzles(const Token& number, std::size_t at, Expr* value);
     Expr* parseName();
     Expr* parseInitList();
     std::vector<Expr*> parseArguments();

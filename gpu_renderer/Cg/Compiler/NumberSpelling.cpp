@@ -67,10 +67,14 @@ std::size_t exponentAt(std::string_view text, std::size_t at) {
     return count == 0 ? 0 : digits + count - at;
 }
 
-/// `.` and letters: what a swizzle looks like.
+/// `.` and letters, once or more often: what swizzles look like.
 bool isSwizzle(std::string_view rest) {
-    return rest.size() > 1 && rest[0] == '.' && isLetter(rest[1]) &&
-           rest.find('.', 1) == std::string_view::npos;
+    if (rest.empty() || rest[0] != '.')
+        return false;
+    for (std::size_t at = 0; at < rest.size(); ++at)
+        if (rest[at] == '.' && (at + 1 == rest.size() || !isLetter(rest[at + 1])))
+            return false;
+    return true;
 }
 
 NumberSpelling::Kind withSuffix(std::string_view text, NumberSpelling& number, bool isWhole) {

@@ -233,7 +233,7 @@ private:
         const bool isPlace = word == "in" || word == "out" || word == "inout" || word == "uniform" ||
                              word == "varying" || word == "row_major" || word == "column_major";
         return (isPlace || isEmptyQualifier(word)) && isAt(TokenKind::NAME, ahead + 1) &&
-               !mScopes.isVariableOrFunction(word);
+               !mScopes.isVariableOrFunction(word) && !mScopes.isType(word);
     }
 
     static void addQualifier(Qualifiers& qualifiers, Name word) {
