@@ -262,6 +262,8 @@ private:
             std::fill(mPiece + begin, mPiece + end, pixel);
     }
 
+    alignas(64) Pixel mPiece[PIECE + DIAGONAL_PERIOD]; ///< the part of one line that lies in these columns
+
     Layout mLayout;
     PatternPicture mPicture;
     PixelRows<Pixel> mRows;
@@ -271,8 +273,6 @@ private:
     uint32_t mEnd = 0;
     uint32_t mX = 0;
     uint32_t mCount = 0;
-
-    alignas(64) Pixel mPiece[PIECE + DIAGONAL_PERIOD]; ///< the part of one line that lies in these columns
 };
 
 template <class Layout>
