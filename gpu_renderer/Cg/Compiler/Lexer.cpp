@@ -11,8 +11,6 @@ namespace cg {
 
 namespace {
 
-constexpr std::string_view BYTE_ORDER_MARK = "\xEF\xBB\xBF";
-
 struct Punctuator {
     std::string_view text;
     TokenKind kind;
@@ -98,12 +96,7 @@ bool isLineEnd(char c) {
 } // namespace
 
 Lexer::Lexer(SourceFiles& files, std::uint32_t file, Diagnostics& diagnostics)
-    : Lexer(files, files.text(file), {file, 1, 1}, diagnostics) {
-    if (mText.substr(0, BYTE_ORDER_MARK.size()) == BYTE_ORDER_MARK) {
-        mAt = BYTE_ORDER_MARK.size();
-        passContinuations();
-    }
-}
+    : Lexer(files, files.text(file), {file, 1, 1}, diagnostics) {}
 
 Lexer::Lexer(SourceFiles& files, std::string_view text, SourceLocation start, Diagnostics& diagnostics)
     : mFiles(files), mDiagnostics(diagnostics), mText(text), mStart(start) {

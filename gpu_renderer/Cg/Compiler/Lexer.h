@@ -12,9 +12,9 @@ namespace cg {
 class Diagnostics;
 class SourceFiles;
 
-/// Cuts a text into tokens. Comments and `\` before a line end vanish; LF, CR LF and CR end a line; a byte
-/// order mark at the start is passed over. Only a comment without its end is reported here: what else is
-/// wrong becomes a BAD token, which is no error in a place that is skipped.
+/// Cuts a text into tokens. Comments and `\` before a line end vanish; LF, CR LF and CR end a line. Only a
+/// comment without its end is reported here: what else is wrong becomes a BAD token, which is no error in a
+/// place that is skipped.
 class Lexer {
 public:
     /// Reads a file from its start.

@@ -5,9 +5,17 @@
 
 namespace cg {
 
+namespace {
+
+constexpr std::string_view BYTE_ORDER_MARK = "\xEF\xBB\xBF";
+
+} // namespace
+
 std::uint32_t SourceFiles::add(std::string name, std::string text) {
     File& file = mFiles.emplace_back();
     file.name = std::move(name);
+    if (text.compare(0, BYTE_ORDER_MARK.size(), BYTE_ORDER_MARK) == 0)
+        text.erase(0, BYTE_ORDER_MARK.size());
     file.text = std::move(text);
     const auto index = static_cast<std::uint32_t>(mFiles.size() - 1);
     mIndexByName.emplace(file.name, index);

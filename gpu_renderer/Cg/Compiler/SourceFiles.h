@@ -18,7 +18,7 @@ namespace cg {
 /// tree hold plain views; must outlive both.
 class SourceFiles {
 public:
-    /// Takes a file in; the first one is the program's main file.
+    /// Takes a file in, without its byte order mark; the first one is the program's main file.
     /// @param name  as errors show it, and the path that its includes are relative to
     /// @return its index, for SourceLocation::file
     std::uint32_t add(std::string name, std::string text);
