@@ -414,6 +414,7 @@ TEST(CgParser, OrdinaryNames) {
          "float asm"},
         {"struct L { float a; }; void f() { L L; L.a = (L).a; } L g();",
          "struct L { float a; }\nvoid f() { L L; (L.a = L.a); }\nL g()"},
+        {"struct texture { float a; }; texture t;", "struct texture { float a; }\ntexture t"},
         {"typedef float2 vec2; vec2 sampler_state; vec2 f() { return sampler_state; }",
          "typedef float2 vec2\nvec2 sampler_state\nvec2 f() { return sampler_state; }"},
     };

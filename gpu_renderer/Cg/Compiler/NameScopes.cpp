@@ -14,9 +14,13 @@ bool NameScopes::isType(std::string_view name) const {
     return answer->second;
 }
 
-bool NameScopes::isVariableOrFunction(std::string_view name) const {
+bool NameScopes::isDeclared(std::string_view name) const {
     const auto found = mMeanings.find(name);
-    return found != mMeanings.end() && !found->second.empty() && !found->second.back();
+    return found != mMeanings.end() && !found->second.empty();
+}
+
+bool NameScopes::isVariableOrFunction(std::string_view name) const {
+    return isDeclared(name) && !isType(name);
 }
 
 void NameScopes::declare(std::string_view name, bool isType) {

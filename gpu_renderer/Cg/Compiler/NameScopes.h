@@ -36,6 +36,7 @@ public:
     /// Declared by the program, or a type that the language has.
     bool isType(std::string_view name) const;
 
+    bool isDeclared(std::string_view name) const; ///< by the program, as whatever
     bool isVariableOrFunction(std::string_view name) const;
 
 private:

@@ -14,9 +14,6 @@ namespace {
 
 constexpr Name ASSEMBLY = "asm";
 
-/// A type of the language, but texts have no use outside effect files.
-constexpr Name TEXT_TYPE = "string";
-
 /// Qualifiers that change nothing. They are ordinary names where no type follows.
 bool isEmptyQualifier(Name word) {
     static const std::unordered_set<Name> WORDS{
@@ -33,9 +30,9 @@ bool isEffectBlock(Name word) {
 
 /// Types that only effect files have; what is declared with them has no part in a program.
 bool isEffectType(Name word) {
-    static const std::unordered_set<Name> WORDS{"texture",     "texture1D",    "texture2D",    "texture3D",
-                                                "textureCUBE", "textureRECT",  "Texture",      "pixelshader",
-                                                "PixelShader", "vertexshader", "VertexShader", "stateblock"};
+    static const std::unordered_set<Name> WORDS{
+        "string",  "texture",     "texture1D",   "texture2D",    "texture3D",    "textureCUBE", "textureRECT",
+        "Texture", "pixelshader", "PixelShader", "vertexshader", "VertexShader", "stateblock"};
     return WORDS.count(word) != 0;
 }
 
@@ -147,8 +144,7 @@ private:
     bool isAtEffectObject() const {
         if (!isAt(TokenKind::NAME) || !isAt(TokenKind::NAME, 1))
             return false;
-        const Name word = token().text;
-        return word == TEXT_TYPE || (isEffectType(word) && !mScopes.isType(word));
+        return isEffectType(token().text) && !mScopes.isDeclared(token().text);
     }
 
     /// `texture diffuse : DIFFUSE < string name = "brick.png"; >;`
