@@ -1,7 +1,8 @@
 // What Cg costs beside what OpenGL costs.
 //
 //   cg-translate   limit: OpenGL compiles and links a program's GLSL; translate: Cg to that GLSL
-//   cg-switch      limit: a draw after a switch between linked pairs; switch: the same with bound Cg programs
+//   cg-switch      limit: a switch between linked pairs and a draw; switch: the same with bound Cg programs;
+//                  switch-and-enable: the profile enabled before and disabled after, as for one draw
 //   cg-set         limit: glProgramUniform4fv; set: cgGLSetParameter4fv
 //
 // The size is the program's: lines of Cg, or 1 where it does not matter. bench/compare knows the targets.
@@ -96,16 +97,24 @@ CGprogram makeProgram(CGcontext context, CGprofile profile, const char* entry) {
     return program;
 }
 
-void add(const std::string& row, const std::function<void()>& work) {
-    benchmark::RegisterBenchmark(row.c_str(), [work](benchmark::State& state) {
+using Work = std::function<void()>;
+
+/// A row. The work is done once before it is timed: a driver finishes its compilation at the first draw.
+void add(
+    const std::string& row, const Work& work, const Work& prepare = [] {}) {
+    benchmark::RegisterBenchmark(row.c_str(), [=](benchmark::State& state) {
+        prepare();
+        work();
+        work();
         for (auto _ : state)
             work();
     })->Unit(benchmark::kMicrosecond);
 }
 
-void addLimit(const std::string& group, const std::function<void()>& work) {
-    add(group + "limit", work);
-    add(group + "limit-again", work);
+void addLimit(
+    const std::string& group, const Work& work, const Work& prepare = [] {}) {
+    add(group + "limit", work, prepare);
+    add(group + "limit-again", work, prepare);
 }
 
 void addTranslation(const char* file) {
@@ -137,22 +146,35 @@ void addSwitching() {
         which = 1 - which;
         glUseProgram(pairs[which]);
         draw();
-        glUseProgram(0);
     });
     CGcontext context = cgCreateContext();
     CGprogram place = makeProgram(context, CG_PROFILE_GLSLV, "place");
     const std::array<CGprogram, 2> shows = {makeProgram(context, CG_PROFILE_GLSLF, "show"),
                                             makeProgram(context, CG_PROFILE_GLSLF, "show")};
-    add("cg-switch/1/switch", [place, shows, which = size_t{0}]() mutable {
-        which = 1 - which;
+    const auto enable = [place] {
+        glUseProgram(0);
         cgGLEnableProfile(CG_PROFILE_GLSLV);
         cgGLEnableProfile(CG_PROFILE_GLSLF);
         cgGLBindProgram(place);
-        cgGLBindProgram(shows[which]);
-        draw();
-        cgGLDisableProfile(CG_PROFILE_GLSLF);
-        cgGLDisableProfile(CG_PROFILE_GLSLV);
-    });
+    };
+    add(
+        "cg-switch/1/switch",
+        [shows, which = size_t{0}]() mutable {
+            which = 1 - which;
+            cgGLBindProgram(shows[which]);
+            draw();
+        },
+        enable);
+    add(
+        "cg-switch/1/switch-and-enable",
+        [shows, which = size_t{0}]() mutable {
+            which = 1 - which;
+            cgGLEnableProfile(CG_PROFILE_GLSLF);
+            cgGLBindProgram(shows[which]);
+            draw();
+            cgGLDisableProfile(CG_PROFILE_GLSLF);
+        },
+        enable);
 }
 
 void addSetting() {
