@@ -1,12 +1,16 @@
 #include <FwZel/Shader.h>
+#include <FwZel/VertexListPlane.h>
 
 #include <fixture/CgCalls.h>
+#include <fixture/FloatCanvas.h>
 #include <fixture/GlTest.h>
 
 #include <sys/wait.h>
 #include <unistd.h>
 
+#include <cstdio>
 #include <cstdlib>
+#include <fstream>
 #include <map>
 #include <memory>
 #include <sstream>
@@ -189,6 +193,57 @@ TEST_F(Shaders, WithoutAResourceTableResourceOperationsAreReported) {
     EXPECT_EQ(takeCgCalls(), Calls{});
 }
 
+/// A source file that is gone with the object.
+class SourceFile {
+public:
+    explicit SourceFile(const std::string& source)
+        : mPath(testing::TempDir() + "shaders-" + std::to_string(getpid()) + ".cg") {
+        std::ofstream(mPath) << source;
+    }
+    ~SourceFile() { std::remove(mPath.c_str()); }
+    SourceFile(const SourceFile&) = delete;
+    SourceFile& operator=(const SourceFile&) = delete;
+
+    const std::string& path() const { return mPath; }
+
+private:
+    std::string mPath;
+};
+
+TEST_F(Shaders, PlaneIsDrawnByBothProgramsWithTheirParameters) {
+    const SourceFile file(R"(
+        uniform float gain;
+        void place(float4 position : POSITION, uniform float2 scale,
+                   out float4 placed : POSITION, out float4 colour : COLOR) {
+            placed = float4(position.xy * scale, position.zw);
+            colour = float4(gain, 0, 0, 1);
+        }
+        float4 mixed(float4 colour : COLOR, uniform float4x4 mixing, uniform float3 lift) : COLOR {
+            return gain * (mul(mixing, colour) + float4(lift, 0));
+        })");
+    Shader vertex(Shader::TYPE_VERTEX, file.path(), "place");
+    Shader fragment(Shader::TYPE_FRAGMENT, file.path(), "mixed");
+    const float firstRowLast[] = {0, 0, 0, 1, 0, 1, 0, 0, 0, 0, 1, 0, 1, 0, 0, 0};
+    vertex.addCgParam("gain", 1, 1, 0.25F, 0, 0, 0);
+    vertex.addCgParam("scale", 2, 1, 2, 4, 0, 0);
+    fragment.addCgParam("gain", 1, 1, 0.5F, 0, 0, 0);
+    fragment.addCgParam("mixing", 14, 1, firstRowLast);
+    fragment.addCgParam("lift", 3, 1, 0, 0.125F, 0.5F, 0);
+    for (Shader* const shader : {&vertex, &fragment}) {
+        shader->getNamedCgParameterAll();
+        shader->setCgParamAll();
+        shader->bindProgram();
+        shader->enableProfile();
+    }
+    FloatCanvas canvas(4, 4);
+    VertexListPlane plane(1, 1, 0.25F, &fragment);
+    plane.render();
+    vertex.disableProfile();
+    fragment.disableProfile();
+    EXPECT_EQ(canvas.pixels(), std::vector<Pixel>(16, Pixel{0.5F, 0.0625F, 0.25F, 0.125F}));
+    EXPECT_EQ(cgGetError(), CG_NO_ERROR);
+}
+
 TEST_F(Shaders, ProfilesHaveTheNamesOfTheirEnumerators) {
     const std::map<int, std::string> names = {
         {6145, "CG_PROFILE_UNKNOWN"},
@@ -296,6 +351,7 @@ void leaveAnotherError() {
 
 TEST_F(Shaders, PendingCompilerErrorIsLoggedAndEndsTheProcess) {
     const std::string listing = failToCompile();
+    EXPECT_NE(listing, "");
     EXPECT_EQ(endOf([] { const Shader shader; }), "exit 1\n3 GPUR 452: " + listing + "\n");
     EXPECT_EQ(endOf([] { Shader::checkForCgError("loading"); }), "exit 1\n3 GPUR 452: " + listing + "\n");
 }
