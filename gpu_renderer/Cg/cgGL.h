@@ -133,10 +133,13 @@ CG_API void cgGLSetMatrixParameterArrayfc(CGparameter parameter, long offset, lo
  */
 CG_API void cgGLSetTextureParameter(CGparameter parameter, unsigned int texture);
 
-/** Binds the sampler's texture to the sampler's unit, at the target of the sampler's type. */
+/**
+ * Binds the sampler's texture to the sampler's unit, at the target of the sampler's type. A sampler that was
+ * given no texture, or that the compiled program does not use, is passed over.
+ */
 CG_API void cgGLEnableTextureParameter(CGparameter parameter);
 
-/** Leaves the target of the sampler's type without a texture at the sampler's unit. */
+/** Leaves the target of the sampler's type without a texture at the sampler's unit; passes over likewise. */
 CG_API void cgGLDisableTextureParameter(CGparameter parameter);
 
 /** The sampler's texture unit as OpenGL's enumerant, GL_TEXTURE0 plus the unit; 0 on an error. */
