@@ -239,7 +239,8 @@ const FunctionDecl* Resolver::choose(SourceLocation at, Name name,
         mDiagnostics.error(at,
                            "no matching function " + inQuotes(name) + " for (" + listTypes(arguments) + ")");
         for (const FunctionDecl* function : functions)
-            mDiagnostics.note(function->location, "candidate: " + describe(function));
+            if (signatureOf(function).result)
+                mDiagnostics.note(function->location, "candidate: " + describe(function));
     }
     return nullptr;
 }
@@ -302,6 +303,8 @@ Function* Resolver::instance(const FunctionDecl* declaration, const std::vector<
                            inQuotes(declaration->name) + " is declared but not defined");
         return nullptr;
     }
+    if (!signatureOf(definition).result)
+        return nullptr; // its own error has been said
     const bool hasWritableSelf = selfModel && selfModel->direction == Direction::INOUT;
     std::vector<Instance>& instances = mInstances[definition];
     for (const Instance& known : instances)
