@@ -201,6 +201,8 @@ TypedExpr* Resolver::name(const NameExpr* expr) {
         Variable* variable = globalVariable(global->second);
         return variable ? useVariable(expr->location, variable) : nullptr;
     }
+    if (Variable* variable = outliveLoop(expr->location, expr->name))
+        return useVariable(expr->location, variable);
     std::vector<Name> known;
     for (const ScopeEntry& entry : mContext.scope)
         if (entry.variable)

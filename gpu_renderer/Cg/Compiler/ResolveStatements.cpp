@@ -87,6 +87,7 @@ TypedStmt* Resolver::statement(const Stmt* stmt) {
 TypedStmt* Resolver::block(const BlockStmt* stmt) {
     TypedStmt* result = make(mArena, TypedStmt::Kind::BLOCK);
     const std::size_t outerScope = mContext.scope.size();
+    const std::size_t outerLoops = mContext.pastLoops.size();
     std::vector<TypedStmt*>* outerStatements = mContext.statements;
     mContext.statements = &result->body;
     for (const Stmt* inner : stmt->statements)
@@ -94,6 +95,7 @@ TypedStmt* Resolver::block(const BlockStmt* stmt) {
             result->body.push_back(resolved);
     mContext.statements = outerStatements;
     mContext.scope.resize(outerScope);
+    mContext.pastLoops.resize(outerLoops);
     return result;
 }
 
@@ -183,8 +185,31 @@ TypedStmt* Resolver::forLoop(const ForStmt* stmt) {
     if (stmt->step)
         result->step = expression(stmt->step);
     result->body = {first, scoped(stmt->body)};
+    for (std::size_t i = outerScope; i < mContext.scope.size(); ++i)
+        if (Variable* variable = mContext.scope[i].variable)
+            mContext.pastLoops.push_back({variable, result});
     mContext.scope.resize(outerScope);
     return result;
+}
+
+/// The variable of a `for` that is used after its loop, as old C++ allowed: its declaration moves out.
+/// @return null where no loop of the blocks around had one of that name
+Variable* Resolver::outliveLoop(SourceLocation at, Name name) {
+    const auto found = std::find_if(mContext.pastLoops.rbegin(), mContext.pastLoops.rend(),
+                                    [name](const LoopVariable& past) { return past.variable->name == name; });
+    if (found == mContext.pastLoops.rend())
+        return nullptr;
+    const auto [variable, loop] = *found;
+    const bool isMovedAlready = loop->kind == TypedStmt::Kind::SEQUENCE;
+    if (isMovedAlready)
+        return variable;
+    mDiagnostics.warning(at, inQuotes(name) + " is used after its loop");
+    auto* inner = mArena.make<TypedStmt>(*loop);
+    TypedStmt* declarations = inner->body[0];
+    inner->body[0] = nullptr;
+    *loop = TypedStmt(TypedStmt::Kind::SEQUENCE);
+    loop->body = {declarations, inner};
+    return variable;
 }
 
 TypedStmt* Resolver::switchStatement(const SwitchStmt* stmt) {

@@ -31,10 +31,17 @@ private:
         const Type* type;   ///< null for a variable
     };
 
+    /// A variable of a `for` after its loop.
+    struct LoopVariable {
+        Variable* variable;
+        TypedStmt* loop;
+    };
+
     /// What belongs to the function that is being resolved.
     struct Context {
         Function* function = nullptr;
         std::vector<ScopeEntry> scope;
+        std::vector<LoopVariable> pastLoops;           ///< of the blocks around
         std::vector<TypedStmt*>* statements = nullptr; ///< of the innermost block
         Variable* self = nullptr;                      ///< a method's object
         std::size_t ordinal = 0;                       ///< of the function's declaration
@@ -99,6 +106,7 @@ private:
     TypedStmt* declarations(const DeclStmt* stmt);
     void declareLocal(const VariableDecl* declaration, std::vector<TypedStmt*>& out);
     TypedStmt* forLoop(const ForStmt* stmt);
+    Variable* outliveLoop(SourceLocation at, Name name);
     TypedStmt* returnStatement(const JumpStmt* stmt);
     TypedStmt* discardStatement(const JumpStmt* stmt);
     TypedStmt* switchStatement(const SwitchStmt* stmt);
