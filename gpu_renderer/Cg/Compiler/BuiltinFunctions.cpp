@@ -251,6 +251,7 @@ struct Helper {
 /// bools, N its number of components. A name with a 1 behind it is the one for scalars.
 constexpr Helper HELPERS[] = {
     {"cg_fmod", "T cg_fmod(T x, T y) { return x - y * trunc(x / y); }"},
+    {"cg_remainder", "T cg_remainder(T x, T y) { return x - y * (x / y); }"},
     {"cg_ldexp", "T cg_ldexp(T x, T exponent) { return x * exp2(exponent); }"},
     {"cg_log10", "T cg_log10(T x) { return log2(x) * 0.301029996; }"},
     {"cg_mad", "T cg_mad(T a, T b, T c) { return a * b + c; }"},

@@ -1,5 +1,6 @@
 #include <Cg/Compiler/TypedBuilder.h>
 
+#include <Cg/Compiler/ConstantFolding.h>
 #include <Cg/Compiler/Diagnostics.h>
 
 #include <algorithm>
@@ -599,6 +600,10 @@ TypedExpr* TypedBuilder::binary(SourceLocation at, BinaryOp op, TypedExpr* left,
         }
         return builtin(at, type, "cg_fmod($0, $1)", {reshape(left, type), reshape(right, type)}, "cg_fmod");
     }
+    // GLSL leaves the remainder of a negative number open; Cg's has the sign of the dividend.
+    if (op == BinaryOp::MODULO && scalar == Scalar::INT && !(constantValue(left) && constantValue(right)))
+        return builtin(at, type, "cg_remainder($0, $1)", {reshape(left, type), reshape(right, type)},
+                       "cg_remainder");
     const bool isMatrixProduct =
         op == BinaryOp::MULTIPLY && left->type->isMatrix() && right->type->isMatrix();
     if (isMatrixProduct && !type->isThinMatrix())
