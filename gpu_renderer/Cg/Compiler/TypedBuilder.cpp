@@ -300,8 +300,8 @@ TypedExpr* TypedBuilder::withScalar(TypedExpr* expression, Scalar scalar) {
         converted->isUntyped = expression->isUntyped;
         return converted;
     }
-    // Each component of a constructor on its own, so that `float3(1, 0, 0)` needs no conversion of ints.
-    if (expression->kind == Kind::CONVERT && expression->operands[0]->type->isScalar()) {
+    // What one number for all components is made of, so that `float3 v = 1` needs no conversion of ints.
+    if (expression->kind == Kind::CONVERT && expression->operands[0]->type == mTypes.scalar(type->scalar)) {
         TypedExpr* operand = withScalar(expression->operands[0], scalar);
         return make(Kind::CONVERT, expression->location, mTypes.withScalar(type, scalar), {operand});
     }
