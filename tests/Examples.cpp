@@ -1,0 +1,103 @@
+#include <fixture/GlTest.h>
+#include <fixture/PictureFiles.h>
+#include <fixture/ReadPng.h>
+
+#include <FwZel/VideoTestImage.h>
+
+#include <sys/wait.h>
+
+#include <array>
+#include <cstdio>
+#include <fstream>
+#include <iterator>
+
+namespace {
+
+std::string textOf(const std::string& path) {
+    std::ifstream file(path, std::ios::binary);
+    return {std::istreambuf_iterator<char>(file), std::istreambuf_iterator<char>()};
+}
+
+struct ExampleRun {
+    int exitCode;
+    std::string output; ///< standard output and standard error
+};
+
+/// Runs an example as it was built. The driver's own memory seems to leak when a program lets go of it.
+ExampleRun runExample(const std::string& exampleAndArguments) {
+    const std::string command = "ASAN_OPTIONS=\"$ASAN_OPTIONS:detect_leaks=0\" " FWZEL_EXAMPLES_BUILT "/" +
+                                exampleAndArguments + " 2>&1";
+    std::FILE* const pipe = popen(command.c_str(), "r");
+    std::string output;
+    std::array<char, 4096> chunk = {};
+    while (const size_t size = std::fread(chunk.data(), 1, chunk.size(), pipe))
+        output.append(chunk.data(), size);
+    const int status = pclose(pipe);
+    return {WIFEXITED(status) ? WEXITSTATUS(status) : -1, output};
+}
+
+/// Skipped where there is no context, as the examples would fail.
+class Examples : public GlTest {};
+
+TEST_F(Examples, SmallestHostDrawsThreeFramesOfMagenta) {
+    const ExampleRun example = runExample("smallest_host");
+    EXPECT_EQ(example.exitCode, 0);
+    EXPECT_EQ(example.output, "frame 0: 191 0 191 in the middle\n"
+                              "frame 1: 191 0 191 in the middle\n"
+                              "frame 2: 191 0 191 in the middle\n");
+}
+
+TEST_F(Examples, ProducerThreadsFramesAreAllDrawnInOrder) {
+    std::string expected;
+    for (int frame = 0; frame < 20; ++frame)
+        expected += "frame " + std::to_string(frame) + ": bar at " + std::to_string(32 * frame) + '\n';
+    const ExampleRun example = runExample("producer_thread");
+    EXPECT_EQ(example.exitCode, 0);
+    EXPECT_EQ(example.output, expected);
+}
+
+TEST_F(Examples, ReadbackFileShowsThePatternToTheByte) {
+    constexpr uint32_t WIDTH = 640;
+    constexpr uint32_t HEIGHT = 360;
+    Bytes pattern(size_t{WIDTH} * HEIGHT * 4);
+    VideoTestImage::fillTestPattern(pattern.data(), VideoTestImage::COL_RGBA, WIDTH, HEIGHT, WIDTH,
+                                    VideoTestImage::COMBI, 2, 0, 0, WIDTH, HEIGHT, false);
+    const TemporaryFile picture("combi.png");
+    const ExampleRun example = runExample("readback_to_file " + picture.path());
+    EXPECT_EQ(example.exitCode, 0);
+    EXPECT_EQ(example.output, "");
+    const DecodedPng decoded = readPng(picture.path());
+    EXPECT_EQ(decoded.width, WIDTH);
+    EXPECT_EQ(decoded.height, HEIGHT);
+    EXPECT_TRUE(std::equal(decoded.samples.begin(), decoded.samples.end(), pattern.begin(), pattern.end()));
+}
+
+TEST_F(Examples, CgProgramsDrawWithTheirParameters) {
+    const ExampleRun example = runExample("cg_parameters " FWZEL_EXAMPLES "/cg_parameters.cg");
+    EXPECT_EQ(example.exitCode, 0);
+    EXPECT_EQ(example.output, "plane: 217 82 115\nbox: 255 204 0\n");
+}
+
+TEST_F(Examples, WhatCannotBeDoneIsNamed) {
+    const struct {
+        const char* call;
+        const char* reason;
+    } failures[] = {
+        {"readback_to_file /dev/full", "/dev/full"},
+        {"readback_to_file", "usage: readback_to_file FILE.png"},
+        {"cg_parameters /nowhere.cg", "cg_parameters: /nowhere.cg: "},
+        {"cg_parameters", "usage: cg_parameters PROGRAM.cg"},
+    };
+    for (const auto& failure : failures) {
+        const ExampleRun example = runExample(failure.call);
+        EXPECT_EQ(example.exitCode, 1) << failure.call;
+        EXPECT_NE(example.output.find(failure.reason), std::string::npos) << example.output;
+    }
+}
+
+TEST(ExamplesInReadme, SmallestHostIsTheOneThatIsBuilt) {
+    const std::string quote = "```cpp\n" + textOf(FWZEL_EXAMPLES "/smallest_host.cpp") + "```\n";
+    EXPECT_NE(textOf(FWZEL_EXAMPLES "/../README.md").find(quote), std::string::npos);
+}
+
+} // namespace
