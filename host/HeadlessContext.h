@@ -6,7 +6,7 @@
 namespace host {
 
 /// An OpenGL compatibility context without a window, through EGL: on Mesa's surfaceless platform, else on the
-/// first EGL device that takes it. It has no default framebuffer, so draws need an FBO.
+/// first EGL device. It has no default framebuffer, so draws need an FBO.
 ///
 /// Thread: the context is current on the thread that constructed it, until its destruction.
 class HeadlessContext {

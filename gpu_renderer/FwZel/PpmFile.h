@@ -40,9 +40,8 @@ FWZEL_API int getWidthHeightFromPpmFile(std::string fname, uint32_t* width, uint
 /// width x height x 4 reaches 2 GiB, memory for reading is missing, the host buffer is null, or the host
 /// buffer is too small for four components to a pixel (fewer components, a pitch shorter than the width).
 /// @param texBufIndex  buffer, reduced by the texture
-/// @param fid          of an interlaced texture 0: file rows 0, 2, 4 …, 1: file rows 1, 3, 5 …; any other,
-/// and
-///                     every value for a texture that is not interlaced: every row from the top
+/// @param fid          of an interlaced texture 0: file rows 0, 2, 4 …, 1: file rows 1, 3, 5 …; any other:
+///                     every row from the top. A texture that is not interlaced takes every row in any case
 /// @param shift        extra left shift of integer samples in bits, any number; unused for half floats
 /// @param isFp16       two-byte components are half floats
 FWZEL_API void fillTextureFromPpmFile(std::string filename, Texture* tex, uint32_t texBufIndex, uint32_t fid,

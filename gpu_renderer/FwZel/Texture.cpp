@@ -58,7 +58,6 @@ void createBuffer(GLenum target, uint32_t& name, uint32_t size, GLenum usage) {
 } // namespace
 
 // --- Description
-// ---------------------------------------------------------------------------------------------------
 
 void Texture::setDefaultValue(TexArgs& args) {
     args.isMipMapped = false;
@@ -128,7 +127,6 @@ void Texture::printParams() const {}
 void Texture::dumpBuf(void* /*ptr*/) {}
 
 // --- Construction and destruction
-// ----------------------------------------------------------------------------------
 
 Texture::Texture(uint32_t testPattern, const TexArgs& args) : mTestPattern(testPattern) {
     setArgsForTestPattern(args);
@@ -213,7 +211,6 @@ void Texture::resizeBuffers(int num_buf) {
 }
 
 // --- Host buffers
-// --------------------------------------------------------------------------------------------------
 
 uint32_t Texture::ceil(uint32_t in, uint32_t alignByte) {
     return (in + alignByte - 1) & ~(alignByte - 1);
@@ -290,7 +287,6 @@ float Texture::getInterlacedTextureOffset(int evenOdd) const {
 }
 
 // --- OpenGL objects
-// ------------------------------------------------------------------------------------------------
 
 void Texture::createGLBufObjects(uint32_t fid) {
     createGLTex(fid);
@@ -367,7 +363,6 @@ void Texture::setTextureFilter(uint32_t fid) {
 }
 
 // --- Transfers
-// -----------------------------------------------------------------------------------------------------
 
 bool Texture::isWriteAccess() const {
     return mPboAccessType == GL_WRITE_ONLY;
@@ -478,7 +473,6 @@ void Texture::readbackPBOToHostBuf(uint32_t fidPBO, uint32_t fidHostBuf) {
 }
 
 // --- PBO mapping
-// ---------------------------------------------------------------------------------------------------
 
 void Texture::mapPbo(uint32_t buf_num) {
     const uint32_t b = bufferIndex(buf_num);

@@ -69,9 +69,8 @@ public:
     /// Leaves GL_TEXTURE_2D, the pixel buffer and copy buffer targets and the framebuffer unbound; with PBOs
     /// GL_UNPACK_ALIGNMENT (upload) or GL_PACK_ALIGNMENT (readback) stays 4.
     /// @param testPattern  a VideoTestImage::testPattern value; NO_TEST_PATTERN leaves the host buffers
-    /// uncleared. A
-    ///                     fill that would write past a host buffer (fewer than four components, a pitch
-    ///                     shorter than the width) is not made and the buffer is cleared instead.
+    ///                     uncleared. A fill that would write past a host buffer (fewer than four components,
+    ///                     a pitch shorter than the width) is not made and the buffer is cleared instead.
     /// @throw boost::thread_resource_error  the mutex cannot be created; nothing is left behind
     /// Logs 453 for each host buffer that cannot be allocated (2 GiB and more included); that buffer stays
     /// null.
@@ -89,7 +88,6 @@ public:
     virtual ~Texture();
 
     // --- Description
-    // -------------------------------------------------------------------------------------------
 
     uint32_t getWidth() const { return mWidth; }   ///< pixels
     uint32_t getHeight() const { return mHeight; } ///< rows of one buffer: the field height when interlaced
@@ -117,7 +115,6 @@ public:
     uint32_t getFboID(uint32_t buf_num) const { return mFboIDs[bufferIndex(buf_num)]; }
 
     // --- Host buffers
-    // ------------------------------------------------------------------------------------------
 
     /// Start of a host buffer, null when its allocation failed.
     void* getHostBufPtr(uint32_t buf_num) { return mHostBufPtrs[bufferIndex(buf_num)]; }
@@ -147,7 +144,6 @@ public:
     void printParams() const;
 
     // --- Texture objects
-    // ---------------------------------------------------------------------------------------
 
     /// Builds the mip chain of a texture from its level 0. Leaves GL_TEXTURE_2D unbound.
     void generateMipMap(uint32_t fid);
@@ -161,9 +157,9 @@ public:
     void setTextureFilter(uint32_t fid);
 
     // --- Transfers
-    // --------------------------------------------------------------------------------------------- One
-    // identifier: the same buffer on both sides. Two: the source first, then the destination. OpenGL moves
-    // width x height pixels under the pixel-store state of the host's context; the library sets no row
+    //
+    // One identifier: the same buffer on both sides. Two: the source first, then the destination. OpenGL
+    // moves width x height pixels under the pixel-store state of the host's context; the library sets no row
     // length, so host buffers whose pitch differs from the width move as if their rows were width pixels
     // long.
 
@@ -198,7 +194,6 @@ public:
     void readbackPBOToHostBuf(uint32_t fidPBO, uint32_t fidHostBuf);
 
     // --- PBO mapping
-    // -------------------------------------------------------------------------------------------
 
     /// Maps a buffer's PBO, write-only for upload and read-only for readback, and records address and
     /// alignment offset. Sets GL_UNPACK_ALIGNMENT (upload) or GL_PACK_ALIGNMENT (readback) to 4 and leaves
