@@ -249,6 +249,8 @@ void Texture::clearHostBuf(uint32_t buf_num) {
 bool Texture::fillFitsHostBuf(uint32_t bytesPerElement) {
     if (mWidth == 0 || mHeight == 0)
         return true;
+    if (mBytePerPix == 0)
+        return false;
     const uint64_t elementsToLastPixel =
         (uint64_t{mHeight - 1} * mPitchInPix + mWidth) * COMPONENTS_OF_A_FILL;
     return elementsToLastPixel <= hostBufBytes() / bytesPerElement;
