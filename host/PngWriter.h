@@ -3,9 +3,14 @@
 
 #include "PictureView.h"
 
+#include <cstdint>
+
 namespace host {
 
 class OutputFile;
+
+/// The width and height, in pixels, above which libpng refuses to write.
+constexpr uint32_t MAX_PNG_SIDE = 1000000;
 
 /// What a pixel of the picture is made of.
 enum class PngPixel {

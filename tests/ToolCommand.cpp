@@ -157,6 +157,7 @@ TEST(Tool, WrongCallsAreRefusedWithTheReason) {
         {"pattern combi -o OUT.png --size 0x5", "--size: \"0x5\" is no size"},
         {"pattern combi -o OUT.png --size 4294967297x5", "--size: \"4294967297x5\" is no size"},
         {"pattern combi -o OUT.png --size 65536x65536", "--size: the picture takes 2 GiB or more"},
+        {"pattern combi -o OUT.png --size 1000001x1", "--size: PNG takes 1000000 pixels a side at most"},
         {"pattern combi -o OUT.png --size 5x1 --field odd", "--size: a field of one line has no rows"},
         {"pattern colour-bar-100 -o OUT.png --size 7x9", "eight colour bars need a width of 8"},
         {"pattern combi -o OUT.png --size 9x9 --region 5x5+5+0",

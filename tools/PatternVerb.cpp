@@ -134,6 +134,9 @@ void refuseImpossibleSize(const PatternPicture& picture) {
         throw WrongCall("--size: eight colour bars need a width of 8 pixels or more");
     if (picture.height == 0)
         throw WrongCall("--size: a field of one line has no rows");
+    if (picture.format == Format::PNG && std::max(picture.width, picture.height) > host::MAX_PNG_SIDE)
+        throw WrongCall("--size: PNG takes " + std::to_string(host::MAX_PNG_SIDE) +
+                        " pixels a side at most; write raw or PPM");
     if (picture.pitch < picture.width)
         throw WrongCall("--pitch: " + std::to_string(picture.pitch) + " pixels are less than the width, " +
                         std::to_string(picture.width));
