@@ -1,4 +1,5 @@
 #include <fixture/GlTest.h>
+#include <fixture/PictureFiles.h>
 #include <fixture/TextureCalls.h>
 
 #include <FwZel/Texture.h>
@@ -6,8 +7,14 @@
 
 #include <array>
 #include <atomic>
+#include <cstdio>
 #include <cstring>
 #include <thread>
+#include <utility>
+
+#include <fcntl.h>
+#include <sys/stat.h>
+#include <unistd.h>
 
 namespace {
 
@@ -114,6 +121,75 @@ TEST_F(PboMapping, UnmappingTwiceFailsAndLeavesThePboBound) {
     GLint bound = 0;
     glGetIntegerv(GL_PIXEL_UNPACK_BUFFER_BINDING, &bound);
     EXPECT_EQ(static_cast<uint32_t>(bound), texture.getPboID(1));
+    glBindBuffer(GL_PIXEL_UNPACK_BUFFER, 0);
+}
+
+boost::mutex* watchedMutex = nullptr;
+std::vector<bool> lockHeld; // at each OpenGL call
+
+void noteLock() {
+    const bool isFree = watchedMutex->try_lock();
+    if (isFree)
+        watchedMutex->unlock();
+    lockHeld.push_back(!isFree);
+}
+
+TEST_F(PboMapping, TheLockCoversTheMappingAloneAndAllOfTheUnmapping) {
+    Texture texture(VideoTestImage::NO_TEST_PATTERN, pboArgs());
+    watchedMutex = &texture.mPboMutex;
+    const SwappedEntryPoint bind(
+        "glBindBuffer", epoxy_glBindBuffer, +[](GLenum, GLuint) { noteLock(); });
+    const SwappedEntryPoint align(
+        "glPixelStorei", epoxy_glPixelStorei, +[](GLenum, GLint) { noteLock(); });
+    const SwappedEntryPoint map(
+        "glMapBuffer", epoxy_glMapBuffer, +[](GLenum, GLenum) -> void* {
+            noteLock();
+            return mappedMemory.data();
+        });
+    const SwappedEntryPoint unmap(
+        "glUnmapBuffer", epoxy_glUnmapBuffer, +[](GLenum) -> GLboolean {
+            noteLock();
+            return GL_TRUE;
+        });
+    texture.mapPbo(0); // bind, align, map, bind 0
+    EXPECT_EQ(std::exchange(lockHeld, {}), (std::vector<bool>{false, false, true, false}));
+    texture.unmapPbo(0); // bind, unmap, bind 0
+    EXPECT_EQ(std::exchange(lockHeld, {}), (std::vector<bool>{true, true, true}));
+}
+
+/// The bytes that work() hands on of a text waiting in standard output.
+template <class Work>
+off_t bytesFlushedBy(Work work) {
+    const TemporaryFile file("output", {});
+    std::fflush(stdout);
+    const int kept = dup(STDOUT_FILENO);
+    const int redirected = open(file.path().c_str(), O_WRONLY | O_CLOEXEC);
+    dup2(redirected, STDOUT_FILENO);
+    std::fputs("waiting", stdout);
+    struct stat before = {};
+    struct stat after = {};
+    fstat(redirected, &before);
+    work();
+    fstat(redirected, &after);
+    std::fflush(stdout);
+    dup2(kept, STDOUT_FILENO);
+    close(kept);
+    close(redirected);
+    return after.st_size - before.st_size;
+}
+
+TEST_F(PboMapping, FailuresOfOpenGlFlushStandardOutput) {
+    Texture texture(VideoTestImage::NO_TEST_PATTERN, pboArgs());
+    const MappingAt mapping(mappedMemory.data());
+    const SwappedEntryPoint unmap(
+        "glUnmapBuffer", epoxy_glUnmapBuffer, +[](GLenum) -> GLboolean { return GL_FALSE; });
+    texture.mapPbo(0);
+    EXPECT_EQ(bytesFlushedBy([&] { texture.unmapPbo(0); }), 7);
+    nextMapping = nullptr;
+    EXPECT_EQ(bytesFlushedBy([&] { texture.mapPbo(0); }), 7);
+    EXPECT_EQ(takeLog(),
+              (std::vector<LogMessage>{{3, "GPUR 460: Texture::unmapPbo : glUnmapBuffer() failed\n"},
+                                       {3, "GPUR 457: Texture::mapPbo : glMapBuffer() failed\n"}}));
     glBindBuffer(GL_PIXEL_UNPACK_BUFFER, 0);
 }
 
