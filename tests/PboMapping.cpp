@@ -203,8 +203,10 @@ TEST_F(PboMapping, EveryFrameOfAProducerThreadArrivesWhole) {
     std::atomic<int> framesWritten{0};
     std::thread producer([&] {
         for (int frame = 0; frame < FRAMES; ++frame) {
-            while (framesMapped.load(std::memory_order_acquire) <= frame)
+            while (framesMapped.load(std::memory_order_acquire) <= frame) {
                 (void)texture.getPboOffset(static_cast<uint32_t>(frame));
+                std::this_thread::yield();
+            }
             std::memset(texture.getAlignedPboPtr(static_cast<uint32_t>(frame)), frame & 0xFF, frameBytes);
             framesWritten.store(frame + 1, std::memory_order_release);
         }
