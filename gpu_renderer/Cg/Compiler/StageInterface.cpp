@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <cctype>
+#include <map>
 #include <set>
 
 namespace cg {
@@ -9,7 +10,11 @@ namespace cg {
 namespace {
 
 constexpr int TEXTURE_COORDINATES = 8;
-constexpr int FREE_LOCATIONS = 8; ///< varyings beyond the texture coordinates that have names, not numbers
+
+/// Locations of varyings: texture coordinates from the ninth on, those below, and others by their names.
+constexpr int FIRST_NAMED_LOCATION = TEXTURE_COORDINATES;
+constexpr int FIRST_HASHED_LOCATION = FIRST_NAMED_LOCATION + 3;
+constexpr int LOCATIONS = 31; ///< that common drivers have
 
 /// A semantic and its number: TEXCOORD, 3.
 struct NumberedSemantic {
@@ -139,12 +144,34 @@ bool isDepth(const std::string& name) {
     return isOneOf(name, {"DEPTH", "DEPR", "SV_DEPTH"});
 }
 
-/// A location that follows from the name alone, as both stages are compiled apart.
-int hashed(const std::string& name) {
+/// A location that follows from the semantic alone, as the stages are compiled apart and may carry different
+/// sets of them.
+int locationOf(const NumberedSemantic& semantic) {
+    if (semantic.name == "TEXCOORD" && semantic.number < 2 * TEXTURE_COORDINATES)
+        return semantic.number - TEXTURE_COORDINATES;
+    if (semantic.number == 0) {
+        if (semantic.name == "NORMAL")
+            return FIRST_NAMED_LOCATION;
+        if (semantic.name == "TANGENT")
+            return FIRST_NAMED_LOCATION + 1;
+        if (isOneOf(semantic.name, {"BINORMAL", "BITANGENT"}))
+            return FIRST_NAMED_LOCATION + 2;
+    }
     unsigned hash = 2166136261U;
-    for (const char c : name)
+    for (const char c : semantic.name)
         hash = (hash ^ static_cast<unsigned char>(c)) * 16777619U;
-    return static_cast<int>(hash % FREE_LOCATIONS);
+    hash += static_cast<unsigned>(semantic.number); // so that those of one name never meet
+    return FIRST_HASHED_LOCATION + static_cast<int>(hash % (LOCATIONS - FIRST_HASHED_LOCATION));
+}
+
+/// The name of a variable for a semantic that OpenGL has none for.
+std::string freeName(const std::string& text, bool isAttribute) {
+    const NumberedSemantic semantic = split(text);
+    std::string name = isAttribute ? "attribute_" : "varying_";
+    for (const char c : semantic.name + std::to_string(semantic.number))
+        if (std::isalnum(static_cast<unsigned char>(c)) != 0 || (c == '_' && name.back() != '_'))
+            name += c;
+    return name;
 }
 
 } // namespace
@@ -176,19 +203,17 @@ StageSlot StageInterface::builtinSlot(const StageValue& value) const {
     return {};
 }
 
-/// Locations of what has no built-in variable. Texture coordinates from the ninth on have fixed ones; names
-/// are spread over the others, in alphabetical order where two meet.
+/// Locations of what has no built-in variable; the next one where two meet.
 void StageInterface::declareFree(const std::vector<StageValue>& values, bool isOutput) {
-    std::set<std::string> semantics;
+    const bool isAttribute = mStage == Stage::VERTEX && !isOutput;
+    std::map<std::string, NumberedSemantic> semantics; // by the names of their variables
     for (const StageValue& value : values)
         if (value.isOutput == isOutput && builtinSlot(value).glsl.empty())
-            semantics.insert(value.semantic);
-    const bool isAttribute = mStage == Stage::VERTEX && !isOutput;
+            semantics.emplace(freeName(value.semantic, isAttribute), split(value.semantic));
     if (mStage == Stage::FRAGMENT && isOutput)
         return; // OpenGL has nowhere to put it
     std::set<int> taken;
-    for (const std::string& text : semantics) {
-        const NumberedSemantic semantic = split(text);
+    for (const auto& [name, semantic] : semantics) {
         int location = 0;
         if (isAttribute) {
             const bool isWeight = isOneOf(semantic.name, {"BLENDWEIGHT", "BLENDWEIGHTS"});
@@ -199,20 +224,12 @@ void StageInterface::declareFree(const std::vector<StageValue>& values, bool isO
                                                                          : 6;
             while (taken.count(location) != 0)
                 location = (location + 1) % 16;
-        } else if (semantic.name == "TEXCOORD" && semantic.number < 2 * TEXTURE_COORDINATES) {
-            location = semantic.number - TEXTURE_COORDINATES;
         } else {
-            location = TEXTURE_COORDINATES + hashed(text);
-            for (int tries = 0; taken.count(location) != 0 && tries < FREE_LOCATIONS; ++tries)
-                location = TEXTURE_COORDINATES + (location + 1) % FREE_LOCATIONS;
-            while (taken.count(location) != 0)
-                ++location;
+            location = locationOf(semantic);
+            for (int tries = 0; taken.count(location) != 0 && tries < LOCATIONS; ++tries)
+                location = (location + 1) % LOCATIONS;
         }
         taken.insert(location);
-        std::string name = isAttribute ? "attribute_" : "varying_";
-        for (const char c : text)
-            if (std::isalnum(static_cast<unsigned char>(c)) != 0 || (c == '_' && name.back() != '_'))
-                name += c;
         mDeclarations.push_back({name, location, isOutput});
     }
 }
@@ -221,11 +238,7 @@ StageSlot StageInterface::slot(const StageValue& value) const {
     StageSlot slot = builtinSlot(value);
     if (!slot.glsl.empty() || (mStage == Stage::FRAGMENT && value.isOutput))
         return slot;
-    std::string name = mStage == Stage::VERTEX && !value.isOutput ? "attribute_" : "varying_";
-    for (const char c : value.semantic)
-        if (std::isalnum(static_cast<unsigned char>(c)) != 0 || (c == '_' && name.back() != '_'))
-            name += c;
-    return {name, 4, false, ""};
+    return {freeName(value.semantic, mStage == Stage::VERTEX && !value.isOutput), 4, false, ""};
 }
 
 std::string StageInterface::builtinDeclarations() const {
