@@ -10,6 +10,7 @@ namespace cg {
 namespace {
 
 constexpr int TEXTURE_COORDINATES = 8;
+constexpr int ATTRIBUTES = 16;
 
 /// Locations of varyings: texture coordinates from the ninth on, those below, and others by their names.
 constexpr int FIRST_NAMED_LOCATION = TEXTURE_COORDINATES;
@@ -218,12 +219,12 @@ void StageInterface::declareFree(const std::vector<StageValue>& values, bool isO
         if (isAttribute) {
             const bool isWeight = isOneOf(semantic.name, {"BLENDWEIGHT", "BLENDWEIGHTS"});
             const bool isIndex = isOneOf(semantic.name, {"BLENDINDICES", "BLENDINDEX"});
-            location = isWeight                                          ? 1
-                       : isIndex                                         ? 7
-                       : semantic.name == "ATTR" && semantic.number < 16 ? semantic.number
-                                                                         : 6;
-            while (taken.count(location) != 0)
-                location = (location + 1) % 16;
+            location = isWeight                                                  ? 1
+                       : isIndex                                                 ? 7
+                       : semantic.name == "ATTR" && semantic.number < ATTRIBUTES ? semantic.number
+                                                                                 : 6;
+            for (int tries = 0; taken.count(location) != 0 && tries < ATTRIBUTES; ++tries)
+                location = (location + 1) % ATTRIBUTES;
         } else {
             location = locationOf(semantic);
             for (int tries = 0; taken.count(location) != 0 && tries < LOCATIONS; ++tries)
