@@ -7,7 +7,6 @@
 
 namespace {
 
-constexpr int LOG_LEVEL_ERROR = 3;
 constexpr uint32_t NO_TYPE = 0xFFFFFFFF;
 
 uint32_t slotIndex(uint32_t type) {
@@ -30,7 +29,7 @@ CgResourceUnit& CgResource::getCgResourceObj(uint32_t type) {
     const uint32_t index = slotIndex(type);
     if (index < mSize)
         return mResource[index];
-    kxsys_syslog(LOG_LEVEL_ERROR,
+    kxsys_syslog(KXSYS_LOG_ERROR,
                  "CgResource::getCgResourceObj(): type=%d addresses none of %d slots!!, Does nothing\n",
                  static_cast<int>(type), static_cast<int>(mSize));
     return mNoSlot = CgResourceUnit();
@@ -63,6 +62,6 @@ uint32_t CgResource::getCgResourceType(std::string name) const {
                                    [&](const CgResourceUnit& unit) { return unit.getName() == name; });
     if (slot != mResource.end())
         return slot->getType();
-    kxsys_syslog(LOG_LEVEL_ERROR, "GPUR 450: CgResource::getCgResourceType(%s) NOT found!!\n", name.c_str());
+    kxsys_syslog(KXSYS_LOG_ERROR, "GPUR 450: CgResource::getCgResourceType(%s) NOT found!!\n", name.c_str());
     return NO_TYPE;
 }

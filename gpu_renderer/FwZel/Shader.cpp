@@ -13,8 +13,6 @@
 
 namespace {
 
-constexpr int LOG_LEVEL_ERROR = 3;
-
 struct ProfileName {
     CGprofile profile;
     const char* name;
@@ -99,7 +97,7 @@ void Shader::initCg() {
     mCgProgram = cgCreateProgramFromFile(mCgContext, CG_SOURCE, mProgramName.c_str(), mCgProfile,
                                          mProgramEntryName.c_str(), nullptr);
     if (!mCgProgram) {
-        kxsys_syslog(LOG_LEVEL_ERROR, "GPUR 451: Shader::initCg(): Program Err. \n");
+        kxsys_syslog(KXSYS_LOG_ERROR, "GPUR 451: Shader::initCg(): Program Err. \n");
         return;
     }
     mCgParam.setCgProgram(mCgProgram);
@@ -129,7 +127,7 @@ void Shader::checkForCgError(std::string /*situation*/) {
     if (error == CG_NO_ERROR)
         return;
     if (error == CG_COMPILER_ERROR)
-        kxsys_syslog(LOG_LEVEL_ERROR, "GPUR 452: %s\n", cgGetLastListing(mCgContext));
+        kxsys_syslog(KXSYS_LOG_ERROR, "GPUR 452: %s\n", cgGetLastListing(mCgContext));
     std::exit(1);
 }
 
@@ -154,13 +152,13 @@ void Shader::setCgResource(uint32_t type, std::string name) {
     if (mCgResource)
         mCgResource->setCgResource(type, std::move(name));
     else
-        kxsys_syslog(LOG_LEVEL_ERROR, "Shader::setCgResource(): no resource slots!!, Does nothing\n");
+        kxsys_syslog(KXSYS_LOG_ERROR, "Shader::setCgResource(): no resource slots!!, Does nothing\n");
 }
 
 CGparameter Shader::getCgResourceParam(std::string name) const {
     if (mCgResource)
         return mCgResource->getCgResourceParam(std::move(name));
-    kxsys_syslog(LOG_LEVEL_ERROR, "Shader::getCgResourceParam(): no resource slots!!, Does nothing\n");
+    kxsys_syslog(KXSYS_LOG_ERROR, "Shader::getCgResourceParam(): no resource slots!!, Does nothing\n");
     return nullptr;
 }
 

@@ -16,7 +16,6 @@
 
 namespace {
 
-constexpr int LOG_LEVEL_ERROR = 3;
 constexpr uint32_t WHOLE_FRAME = 2;
 constexpr uint32_t COMPONENTS_OF_A_FILL = 4;
 
@@ -234,7 +233,7 @@ void Texture::allocHostBufs(uint32_t fid) {
     // 32-bit sizes wrap: a picture that does not fit them gets no buffer rather than a short one.
     mHostBufPtrs[fid] = hostBufFits() ? memalign(mBufAlignByte, hostBufBytes()) : nullptr;
     if (!mHostBufPtrs[fid]) {
-        kxsys_syslog(LOG_LEVEL_ERROR,
+        kxsys_syslog(KXSYS_LOG_ERROR,
                      "GPUR 453: Texture::createTexture():: bufNum=%d, Cannot allocate texture memory\n",
                      static_cast<int>(fid));
         return;
@@ -386,7 +385,7 @@ void Texture::copyHostBufToGLTex(uint32_t fidHostBuf, uint32_t fidGLTex) {
 
 void Texture::copyPBOToGLTex(uint32_t fid) {
     if (!mIsPBO) {
-        kxsys_syslog(LOG_LEVEL_ERROR, "GPUR 456: Texture::copyPBOToGLTex: ERROR No PBO in this texture\n");
+        kxsys_syslog(KXSYS_LOG_ERROR, "GPUR 456: Texture::copyPBOToGLTex: ERROR No PBO in this texture\n");
         return;
     }
     uploadFromPBO(fid, fid);
@@ -394,7 +393,7 @@ void Texture::copyPBOToGLTex(uint32_t fid) {
 
 void Texture::copyPBOToGLTex(uint32_t fidPBO, uint32_t fidGLTex) {
     if (!mIsPBO) {
-        kxsys_syslog(LOG_LEVEL_ERROR, "GPUR 454: Texture::copyPBOToGLTex: ERROR No PBO in this texture\n");
+        kxsys_syslog(KXSYS_LOG_ERROR, "GPUR 454: Texture::copyPBOToGLTex: ERROR No PBO in this texture\n");
         return;
     }
     uploadFromPBO(fidPBO, fidGLTex);
@@ -415,7 +414,7 @@ void Texture::copyHostBufToPBO(uint32_t fid) {
 
 void Texture::copyHostBufToPBO(uint32_t fidHostBuf, uint32_t fidPBO) {
     if (!mIsPBO) {
-        kxsys_syslog(LOG_LEVEL_ERROR, "GPUR 455: Texture::copyHostBufToPBO: ERROR No PBO in this texture\n");
+        kxsys_syslog(KXSYS_LOG_ERROR, "GPUR 455: Texture::copyHostBufToPBO: ERROR No PBO in this texture\n");
         return;
     }
     writePBO(fidHostBuf, fidPBO);
@@ -423,7 +422,7 @@ void Texture::copyHostBufToPBO(uint32_t fidHostBuf, uint32_t fidPBO) {
 
 void Texture::writePBO(uint32_t fidHostBuf, uint32_t fidPBO) {
     if (mIsPBO && !isWriteAccess()) {
-        kxsys_syslog(LOG_LEVEL_ERROR,
+        kxsys_syslog(KXSYS_LOG_ERROR,
                      "Texture::copyHostBufToPBO: ERROR The PBO of this texture is for readback\n");
         return;
     }
@@ -440,7 +439,7 @@ void Texture::readbackGLTexToPBO(uint32_t fid) {
 
 void Texture::readbackGLTexToPBO(uint32_t fidGLTex, uint32_t fidPBO) {
     if (!mIsPBO || isWriteAccess()) {
-        kxsys_syslog(LOG_LEVEL_ERROR, "Texture::readbackGLTexToPBO: ERROR No readback PBO in this texture\n");
+        kxsys_syslog(KXSYS_LOG_ERROR, "Texture::readbackGLTexToPBO: ERROR No readback PBO in this texture\n");
         return;
     }
     glBindFramebufferEXT(GL_FRAMEBUFFER_EXT, getFboID(fidGLTex));
@@ -462,7 +461,7 @@ void Texture::readbackPBOToHostBuf(uint32_t fid) {
 
 void Texture::readbackPBOToHostBuf(uint32_t fidPBO, uint32_t fidHostBuf) {
     if (mIsPBO && isWriteAccess()) {
-        kxsys_syslog(LOG_LEVEL_ERROR,
+        kxsys_syslog(KXSYS_LOG_ERROR,
                      "Texture::readbackPBOToHostBuf: ERROR The PBO of this texture is for upload\n");
         return;
     }
@@ -489,7 +488,7 @@ void Texture::mapPbo(uint32_t buf_num) {
         __atomic_store_n(&mPboOffsets[b], ceil(addressLow, mPboAlignByte) - addressLow, __ATOMIC_RELAXED);
     }
     if (!mPboPtrs[b]) {
-        kxsys_syslog(LOG_LEVEL_ERROR, "GPUR 457: Texture::%s : glMapBuffer() failed\n", "mapPbo");
+        kxsys_syslog(KXSYS_LOG_ERROR, "GPUR 457: Texture::%s : glMapBuffer() failed\n", "mapPbo");
         std::fflush(stdout);
         return;
     }
@@ -500,7 +499,7 @@ void Texture::unmapPbo(uint32_t buf_num) {
     const uint32_t b = bufferIndex(buf_num);
     const boost::mutex::scoped_lock lock(mPboMutex);
     if (!mPboPtrs[b]) {
-        kxsys_syslog(LOG_LEVEL_ERROR,
+        kxsys_syslog(KXSYS_LOG_ERROR,
                      isWriteAccess() ? "GPUR 458: Texture::unmapPbo(): mPboPtrs[%d] = NULL\n"
                                      : "GPUR 459: Texture::unmapPbo(): mPboPtrs[%d] = NULL\n",
                      static_cast<int>(b));
@@ -509,7 +508,7 @@ void Texture::unmapPbo(uint32_t buf_num) {
     const GLenum target = mappingTarget(isWriteAccess());
     glBindBuffer(target, mPboIDs[b]);
     if (glUnmapBuffer(target) != GL_TRUE) {
-        kxsys_syslog(LOG_LEVEL_ERROR, "GPUR 460: Texture::%s : glUnmapBuffer() failed\n", "unmapPbo");
+        kxsys_syslog(KXSYS_LOG_ERROR, "GPUR 460: Texture::%s : glUnmapBuffer() failed\n", "unmapPbo");
         std::fflush(stdout);
         return;
     }

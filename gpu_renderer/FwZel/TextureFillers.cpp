@@ -30,7 +30,7 @@ Colour orderedColour(uint32_t colOrder, uint32_t Cr, uint32_t Y, uint32_t Cb, ui
 bool isFourBytesPerPixel(const Texture& tex) {
     if (tex.getNumColours() == COMPONENTS && tex.getBytesPerColour() == 1)
         return true;
-    kxsys_syslog(3,
+    kxsys_syslog(KXSYS_LOG_ERROR,
                  "VideoTestImage::fillTextureColourPartial(): numColours=%d or numBytesPerColour=%d is not "
                  "supported!!, Does nothing\n",
                  static_cast<int>(tex.getNumColours()), static_cast<int>(tex.getBytesPerColour()));
