@@ -43,7 +43,7 @@ double integerOperation(BinaryOp op, double left, double right, bool& isValid) {
     switch (op) {
     case BinaryOp::DIVIDE:
         isValid = b != 0;
-        return isValid ? static_cast<double>(a / b) : 0;
+        return isValid ? std::trunc(left / right) : 0;
     case BinaryOp::MODULO:
         isValid = b != 0;
         return isValid ? static_cast<double>(a % b) : 0;
@@ -299,7 +299,9 @@ private:
             Values cut;
             for (int row = 0; row < to->rows; ++row)
                 for (int column = 0; column < to->columns; ++column)
-                    cut.push_back((*values)[static_cast<std::size_t>(row * from->columns + column)]);
+                    cut.push_back(
+                        (*values)[static_cast<std::size_t>(row) * static_cast<std::size_t>(from->columns) +
+                                  static_cast<std::size_t>(column)]);
             values = cut;
         }
         return rounded(*values, to);

@@ -157,7 +157,7 @@ void GlslEmitter::nameGlobals() {
     for (const Function* function : mProgram.functions) {
         std::string name(function->name);
         if (function->declaration && !function->declaration->ownerName.empty())
-            name = std::string(function->declaration->ownerName) + "_" + name;
+            name.insert(0, std::string(function->declaration->ownerName) + "_");
         mFunctionNames[function] = mNames.global(name);
     }
 }
@@ -589,10 +589,12 @@ std::string GlslEmitter::printed(const TypedExpr* expression, int& precedence) {
             return array + "[" + index + "]";
         // A row of a flat array.
         const int length = flatLength(expression->type);
+        const std::string first = array + "[" + index + " * " + std::to_string(length) + " + ";
         std::string text = typeName(expression->type) + "[" + std::to_string(length) + "](";
-        for (int i = 0; i < length; ++i)
-            text += (i == 0 ? "" : ", ") + array + "[" + index + " * " + std::to_string(length) + " + " +
-                    std::to_string(i) + "]";
+        for (int i = 0; i < length; ++i) {
+            text += i == 0 ? first : ", " + first;
+            text += std::to_string(i) + "]";
+        }
         return text + ")";
     }
     case Kind::CALL:

@@ -97,7 +97,7 @@ std::string GlslNames::distinct(std::string_view wanted) const {
     if (name.back() != '_')
         name += '_';
     for (int number = 2;; ++number)
-        if (const std::string candidate = name + std::to_string(number); !isTaken(candidate))
+        if (std::string candidate = name + std::to_string(number); !isTaken(candidate))
             return candidate;
 }
 

@@ -6,6 +6,7 @@
 
 #include <algorithm>
 #include <cctype>
+#include <numeric>
 #include <string>
 
 namespace cg {
@@ -223,6 +224,7 @@ const FunctionDecl* Resolver::choose(SourceLocation at, Name name,
     }
     for (std::size_t i = 0; i < arguments.size() && fitting.size() > 1; ++i) {
         std::vector<int> costs;
+        costs.reserve(fitting.size());
         for (const FunctionDecl* function : fitting)
             costs.push_back(
                 argumentCost(function->parameters[i], signatureOf(function).parameters[i], arguments[i]));
@@ -390,9 +392,8 @@ TypedExpr* Resolver::passArgument(TypedExpr* argument, const Type* type, Directi
         // Of a wider argument only the components that the parameter has are written.
         const int size = type->columns;
         if (argument->type->isVector() && type->isScalarOrVector() && argument->type->columns > size) {
-            std::vector<int> components;
-            for (int i = 0; i < size; ++i)
-                components.push_back(i);
+            std::vector<int> components(static_cast<std::size_t>(size));
+            std::iota(components.begin(), components.end(), 0);
             argument = mBuild.swizzle(at, argument, components);
         }
         TypedExpr* back = mBuild.convert(result, argument->type);
@@ -625,6 +626,46 @@ struct Expansion {
 
 } // namespace
 
+/// GLSL takes constants only as texel offsets: a known one is written as a number, another one is added to
+/// the coordinates.
+/// @param arguments  the offset is the last one
+/// @return the look-up's form
+std::string Resolver::withKnownOffset(const BuiltinFunction& function, std::vector<TypedExpr*>& arguments) {
+    std::string form(function.form);
+    const std::size_t word = form.find("Offset");
+    if (word == std::string::npos)
+        return form;
+    TypedExpr*& offset = arguments.back();
+    const SourceLocation at = offset->location;
+    if (const auto values = constantValue(offset)) {
+        std::vector<TypedExpr*> numbers;
+        for (const double value : *values)
+            numbers.push_back(mBuild.literal(at, mTypes.scalar(Scalar::INT), value));
+        offset = mBuild.construct(at, offset->type, numbers);
+        return form;
+    }
+    // `textureGradOffset($0, $1.xy, $2, $3, $4)` becomes `textureGrad($0, ($1.xy) + ..., $2, $3)`.
+    const std::string last = "$" + std::to_string(arguments.size() - 1);
+    const std::size_t start = form.find("$1");
+    const std::size_t end = form.find_first_of(",)", start);
+    const bool isFetch = form.find("texelFetch") != std::string::npos;
+    const bool isDepth = isDepthSampler(function.parameters[0].sampler);
+    const bool isRect = function.parameters[0].sampler == Sampler::RECT;
+    if (isDepth || form.find("Proj") != std::string::npos) {
+        mDiagnostics.error(at, "the texel offset of this look-up must be a constant");
+        return form;
+    }
+    const int size = offset->type->columns;
+    const std::string type = size == 1 ? "float" : "vec" + std::to_string(size);
+    const std::string texels = isRect ? "" : " / " + type + "(textureSize($0, 0))";
+    const std::string shift = isFetch ? ") + (" + last + ")" : ") + " + type + "(" + last + ")" + texels;
+    const std::size_t separator = form.find(", " + last, end);
+    form.erase(separator, last.size() + 2);
+    form.insert(end, shift);
+    form.insert(start, "(");
+    return form.erase(word, std::string("Offset").size());
+}
+
 /// @param report          an error where the name is known but takes no such arguments
 /// @param withGlslNames   also GLSL's own names
 /// @param isKnown         receives whether there is such a built-in function
@@ -694,9 +735,10 @@ TypedExpr* Resolver::callBuiltin(SourceLocation at, Name name, const std::vector
     if (isAnyNull(passed))
         return nullptr;
 
+    const std::string form = withKnownOffset(*best, passed);
+
     // Components that the form takes of an argument become operands of their own.
     Expansion expansion;
-    const Name form = best->form;
     for (std::size_t i = 0; i < form.size(); ++i) {
         if (form[i] != '$') {
             expansion.form += form[i];
@@ -706,7 +748,7 @@ TypedExpr* Resolver::callBuiltin(SourceLocation at, Name name, const std::vector
         TypedExpr* operand = passed[position];
         if (i + 1 < form.size() && form[i + 1] == '.') {
             std::vector<int> components;
-            const Name letters = "xyzw";
+            constexpr Name letters = "xyzw";
             for (i += 2; i < form.size() && letters.find(form[i]) != Name::npos; ++i)
                 components.push_back(static_cast<int>(letters.find(form[i])));
             --i;
@@ -727,10 +769,10 @@ TypedExpr* Resolver::callBuiltin(SourceLocation at, Name name, const std::vector
     }
     const Type* resultType = typeFor(best->result, bestBinding, mTypes);
     TypedExpr* result = nullptr;
-    if (best->form == "$0") {
+    if (form == "$0") {
         result = expansion.operands[0];
     } else {
-        const Name kept = expansion.form == form ? form : mArena.keep(expansion.form);
+        const Name kept = expansion.form == best->form ? best->form : mArena.keep(expansion.form);
         result = mBuild.builtin(at, resultType, kept, expansion.operands, best->helper);
         result->isUntyped =
             std::all_of(passed.begin(), passed.end(), [](const TypedExpr* e) { return e->isUntyped; });

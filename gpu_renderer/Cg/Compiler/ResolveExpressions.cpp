@@ -66,11 +66,12 @@ std::vector<MatrixElement> matrixSwizzle(Name name) {
         const std::size_t length = fromZero ? 4 : 3;
         if (name.size() < length || name[0] != '_' || elements.size() == 4)
             return {};
-        const int base = fromZero ? '0' : '1';
-        const MatrixElement element{name[length - 2] - base, name[length - 1] - base};
-        if (element.row < 0 || element.row > 3 || element.column < 0 || element.column > 3)
+        const Name digits = fromZero ? "0123" : "1234";
+        const std::size_t row = digits.find(name[length - 2]);
+        const std::size_t column = digits.find(name[length - 1]);
+        if (row == Name::npos || column == Name::npos)
             return {};
-        elements.push_back(element);
+        elements.push_back({static_cast<int>(row), static_cast<int>(column)});
         name = name.substr(length);
     }
     return elements;
@@ -414,13 +415,14 @@ TypedExpr* Resolver::once(TypedExpr* value, TypedExpr*& preparation) {
 
 bool Resolver::checkAssignable(SourceLocation at, TypedExpr* target) {
     Variable* root = rootVariable(target);
-    if (!root || target->kind == Kind::CONVERT) {
-        const bool isRow = root && target->kind == Kind::CONVERT &&
-                           target->type->components() == target->operands[0]->type->components();
-        if (!isRow) {
-            mDiagnostics.error(at, "this cannot be assigned to");
-            return false;
-        }
+    bool isPlace = root != nullptr;
+    for (const TypedExpr* part = target; isPlace && !part->operands.empty(); part = part->operands[0])
+        isPlace = part->kind != Kind::CONVERT ||
+                  (part->type->components() == part->operands[0]->type->components() &&
+                   part->type->scalar == part->operands[0]->type->scalar);
+    if (!isPlace) {
+        mDiagnostics.error(at, "this cannot be assigned to");
+        return false;
     }
     if (root->isConst) {
         mDiagnostics.error(at, inQuotes(root->name) + " is const");

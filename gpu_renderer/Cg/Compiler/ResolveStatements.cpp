@@ -1,5 +1,6 @@
 #include <Cg/Compiler/Resolver.h>
 
+#include <Cg/Compiler/ConstantFolding.h>
 #include <Cg/Compiler/Diagnostics.h>
 
 #include <algorithm>
@@ -18,9 +19,8 @@ bool hasEffect(const TypedExpr* expression) {
     switch (expression->kind) {
     case TypedExpr::Kind::CALL:
     case TypedExpr::Kind::ASSIGN:
+    case TypedExpr::Kind::BUILTIN: // some write to their arguments
         return true;
-    case TypedExpr::Kind::BUILTIN:
-        return true; // some write to their arguments
     case TypedExpr::Kind::UNARY:
         return expression->unary >= UnaryOp::PRE_INCREMENT || hasEffect(expression->operands[0]);
     default:
@@ -68,8 +68,9 @@ TypedStmt* Resolver::statement(const Stmt* stmt) {
     case Kind::CASE: {
         const auto* label = static_cast<const CaseStmt*>(stmt);
         TypedExpr* value = label->value ? expression(label->value) : nullptr;
-        if (value)
-            value = mBuild.convert(value, mTypes.scalar(Scalar::INT));
+        value = value ? mBuild.convert(value, mTypes.scalar(Scalar::INT)) : nullptr;
+        if (const auto known = value ? constantValue(value) : std::nullopt)
+            value = mBuild.literal(stmt->location, value->type, (*known)[0]);
         return value || !label->value ? make(mArena, TypedStmt::Kind::CASE, value) : nullptr;
     }
     case Kind::RETURN:

@@ -12,6 +12,7 @@
 namespace cg {
 
 class Diagnostics;
+struct BuiltinFunction;
 
 /// Turns the syntax tree into the typed tree: finds what each name means, chooses among overloads, makes
 /// conversions explicit, and takes along only what the entry reaches.
@@ -154,6 +155,7 @@ private:
                             std::vector<TypedExpr*> arguments, TypedExpr* self);
     TypedExpr* callBuiltin(SourceLocation at, Name name, const std::vector<TypedExpr*>& arguments,
                            bool report, bool withGlslNames, bool& isKnown);
+    std::string withKnownOffset(const BuiltinFunction& function, std::vector<TypedExpr*>& arguments);
     TypedExpr* passArgument(TypedExpr* argument, const Type* type, Direction direction,
                             std::vector<TypedExpr*>& before, std::vector<TypedExpr*>& after);
     TypedExpr* around(TypedExpr* call, const std::vector<TypedExpr*>& before,

@@ -90,8 +90,7 @@ Variable* rootVariable(const TypedExpr* expression) {
     case Kind::FIELD:
     case Kind::SWIZZLE:
     case Kind::ELEMENT:
-        return rootVariable(expression->operands[0]);
-    case Kind::CONVERT: // between kinds that are one in GLSL
+    case Kind::CONVERT: // between types that are one in GLSL
         return rootVariable(expression->operands[0]);
     default:
         return nullptr;
@@ -169,6 +168,7 @@ TypedExpr* TypedBuilder::swizzle(SourceLocation at, TypedExpr* object, const std
         return object;
     if (object->kind == Kind::SWIZZLE) {
         std::vector<int> inner;
+        inner.reserve(components.size());
         for (const int component : components)
             inner.push_back(object->components[static_cast<std::size_t>(component)]);
         return swizzle(at, object->operands[0], inner);
