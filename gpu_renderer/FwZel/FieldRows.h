@@ -4,6 +4,8 @@
 #include <algorithm>
 #include <cstdint>
 
+// Private to the library: the rows of a field.
+
 /// Which rows of a picture file go into the rows of a texture's buffer: row y takes file row first + y x
 /// step.
 struct FieldRows {

@@ -3,6 +3,8 @@
 
 #include <string>
 
+// Private to the library: the choice of a reader.
+
 /// The picture formats that have a reader.
 enum class PictureFormat { PNG, PPM, UNKNOWN };
 

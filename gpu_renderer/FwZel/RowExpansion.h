@@ -4,6 +4,8 @@
 #include <cstddef>
 #include <cstdint>
 
+// Private to the library.
+
 /// The row loops of the picture readers, in one of the forms that this machine can run. All forms write the
 /// same bytes: the form decides the speed only.
 ///
