@@ -70,6 +70,7 @@ int main(int argc, char** argv) {
         addPatternVerb(command);
         addInfoVerb(command);
         addRoundTripVerb(command);
+        addShaderVerb(command);
         return run(command, argc, argv);
     } catch (const WrongCall& error) {
         return report(error.what(), WRONG_CALL);
