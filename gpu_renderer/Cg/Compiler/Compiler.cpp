@@ -10,6 +10,9 @@
 #include <Cg/Compiler/Resolver.h>
 #include <Cg/Compiler/SourceFiles.h>
 
+#include <cstddef>
+#include <set>
+
 namespace cg {
 
 namespace {
@@ -37,8 +40,14 @@ void translate(const CompileRequest& request, SourceFiles& files, Diagnostics& d
     if (diagnostics.hasErrors())
         return;
     TypeTable types(arena);
-    const TypedProgram* program =
-        Resolver(*unit, request.stage, arena, types, diagnostics).resolve(request.entry);
+    std::set<Name> plainSamplers;
+    std::size_t known = 0;
+    const TypedProgram* program = nullptr;
+    do {
+        known = plainSamplers.size();
+        program =
+            Resolver(*unit, request.stage, arena, types, diagnostics, plainSamplers).resolve(request.entry);
+    } while (!diagnostics.hasErrors() && plainSamplers.size() > known);
     if (diagnostics.hasErrors())
         return;
     const References references(*program);

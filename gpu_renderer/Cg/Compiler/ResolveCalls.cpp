@@ -38,10 +38,6 @@ bool isSameInGlsl(const Type* a, const Type* b) {
            a->columns == b->columns && isFloating(a->scalar) && isFloating(b->scalar);
 }
 
-bool isDepthSampler(Sampler sampler) {
-    return sampler == Sampler::D1_SHADOW || sampler == Sampler::D2_SHADOW || sampler == Sampler::RECT_SHADOW;
-}
-
 bool isNamedAsShadow(const TypedExpr* sampler) {
     const Variable* root = rootVariable(sampler);
     if (!root)
@@ -479,6 +475,9 @@ TypedExpr* Resolver::callFunction(SourceLocation at, const FunctionDecl* declara
         if (isOpaque(parameter->type)) {
             const Type* type = parameter->type;
             agree(sources[i], type->isArray() ? type->element : type);
+            const Variable* source = rootVariable(sources[i]);
+            if (parameter->comparesDepth && source && mPlainSamplers.count(source->name) != 0)
+                mPlainSamplers.insert(parameter->name);
         }
         TypedExpr* passed = passArgument(sources[i], parameter->type, parameter->direction, before, after);
         if (!passed)
@@ -696,7 +695,10 @@ TypedExpr* Resolver::callBuiltin(SourceLocation at, Name name, const std::vector
             int cost = mBuild.cost(arguments[i], type);
             if (operand.kind == Operand::Kind::SAMPLER) {
                 comparesDepth = isDepthSampler(operand.sampler);
-                if (comparesDepth && function.needsShadowName && !isNamedAsShadow(arguments[i]))
+                const Variable* root = rootVariable(arguments[i]);
+                const bool isPlain = root && mPlainSamplers.count(root->name) != 0;
+                if (comparesDepth &&
+                    (isPlain || (function.needsShadowName && !isNamedAsShadow(arguments[i]))))
                     cost = TypedBuilder::IMPOSSIBLE;
                 cost = std::min(cost, 0);
             } else if (comparesDepth && i == 1 && arguments[i]->type->components() != operand.size) {

@@ -25,9 +25,9 @@ std::string upper(Name text) {
 } // namespace
 
 Resolver::Resolver(const TranslationUnit& unit, Stage stage, Arena& arena, TypeTable& types,
-                   Diagnostics& diagnostics)
+                   Diagnostics& diagnostics, std::set<Name>& plainSamplers)
     : mUnit(unit), mStage(stage), mArena(arena), mTypes(types), mDiagnostics(diagnostics),
-      mBuild(arena, types, diagnostics), mProgram(arena.make<TypedProgram>()) {
+      mPlainSamplers(plainSamplers), mBuild(arena, types, diagnostics), mProgram(arena.make<TypedProgram>()) {
     collect();
 }
 

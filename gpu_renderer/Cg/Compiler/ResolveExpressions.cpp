@@ -674,7 +674,12 @@ void Resolver::aliasSamplers(SourceLocation at, TypedExpr* target, TypedExpr* va
 /// A look-up has decided what kind a sampler is.
 void Resolver::agree(TypedExpr* sampler, const Type* type) {
     Variable* root = rootVariable(sampler);
-    if (!root || sampler->type == type)
+    if (!root)
+        return;
+    (isDepthSampler(type->sampler) ? root->comparesDepth : root->givesColour) = true;
+    if (root->comparesDepth && root->givesColour)
+        mPlainSamplers.insert(root->name);
+    if (sampler->type == type)
         return;
     const Type* old = root->type;
     const bool isArray = old->isArray() && !type->isArray();

@@ -5,6 +5,7 @@
 #include <Cg/Compiler/TypedBuilder.h>
 #include <Cg/Compiler/TypedTree.h>
 
+#include <set>
 #include <string>
 #include <unordered_map>
 #include <vector>
@@ -20,8 +21,12 @@ struct BuiltinFunction;
 /// Errors go to the diagnostics; the typed tree is meaningful only where there are none.
 class Resolver {
 public:
+    /// @param plainSamplers  names of samplers that compare no depth, whatever coordinates a look-up has;
+    /// takes
+    ///                       in those that are found to be looked up both ways, which GLSL has no type for:
+    ///                       where it has grown, the program has to be resolved again
     Resolver(const TranslationUnit& unit, Stage stage, Arena& arena, TypeTable& types,
-             Diagnostics& diagnostics);
+             Diagnostics& diagnostics, std::set<Name>& plainSamplers);
 
     TypedProgram* resolve(const std::string& entry);
 
@@ -181,6 +186,7 @@ private:
     Arena& mArena;
     TypeTable& mTypes;
     Diagnostics& mDiagnostics;
+    std::set<Name>& mPlainSamplers;
     TypedBuilder mBuild;
     TypedProgram* mProgram;
 

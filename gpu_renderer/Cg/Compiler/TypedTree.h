@@ -37,6 +37,9 @@ struct Variable {
     TypedExpr* state = nullptr;        ///< UNIFORM: the piece of OpenGL state that it stands for
     bool isConstantExpression = false; ///< a GLOBAL whose initializer GLSL takes as a constant
 
+    bool comparesDepth = false; ///< a sampler that a look-up compares a depth with
+    bool givesColour = false;   ///< a sampler that a look-up takes texels from
+
     /// A sampler that was assigned stands for what was assigned to it: GLSL cannot copy samplers.
     TypedExpr* alias = nullptr;
 

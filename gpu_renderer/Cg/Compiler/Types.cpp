@@ -198,6 +198,10 @@ std::string nameOf(const Type* type) {
     return nameOf(type) + dimensions;
 }
 
+bool isDepthSampler(Sampler sampler) {
+    return sampler == Sampler::D1_SHADOW || sampler == Sampler::D2_SHADOW || sampler == Sampler::RECT_SHADOW;
+}
+
 bool containsSampler(const Type* type) {
     while (type->isArray())
         type = type->element;

@@ -127,6 +127,8 @@ const char* nameOf(Scalar scalar);
 
 bool containsSampler(const Type* type);
 
+bool isDepthSampler(Sampler sampler); ///< one whose look-ups compare a depth
+
 /// A sampler or an array of samplers: nothing that a GLSL struct of ours holds.
 bool isOpaque(const Type* type);
 
