@@ -33,7 +33,8 @@ bool isSizeWord(Name word) {
 }
 
 bool isIntegerWord(Name word) {
-    return isSizeWord(word) || word == "int" || word == "char";
+    return isSizeWord(word) || word == "int" || word == "int2" || word == "int3" || word == "int4" ||
+           word == "char";
 }
 
 struct InfixOperator {

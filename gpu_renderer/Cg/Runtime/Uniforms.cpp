@@ -77,6 +77,21 @@ std::vector<GLint> toInts(GLenum type, int count, const float* values) {
     return ints;
 }
 
+void sendUnsigned(GLuint program, GLint location, GLenum type, int count, const float* values) {
+    const std::vector<GLint> ints = toInts(type, count, values);
+    const std::vector<GLuint> bits(ints.begin(), ints.end()); // a negative number wraps around, as in C
+    switch (valueCount(type)) {
+    case 1:
+        return glProgramUniform1uiv(program, location, count, bits.data());
+    case 2:
+        return glProgramUniform2uiv(program, location, count, bits.data());
+    case 3:
+        return glProgramUniform3uiv(program, location, count, bits.data());
+    default:
+        return glProgramUniform4uiv(program, location, count, bits.data());
+    }
+}
+
 void sendInts(GLuint program, GLint location, GLenum type, int count, const float* values) {
     const std::vector<GLint> ints = toInts(type, count, values);
     switch (valueCount(type)) {
@@ -109,18 +124,22 @@ int valueCount(unsigned int glType) {
     switch (glType) {
     case GL_FLOAT:
     case GL_INT:
+    case GL_UNSIGNED_INT:
     case GL_BOOL:
         return 1;
     case GL_FLOAT_VEC2:
     case GL_INT_VEC2:
+    case GL_UNSIGNED_INT_VEC2:
     case GL_BOOL_VEC2:
         return 2;
     case GL_FLOAT_VEC3:
     case GL_INT_VEC3:
+    case GL_UNSIGNED_INT_VEC3:
     case GL_BOOL_VEC3:
         return 3;
     case GL_FLOAT_VEC4:
     case GL_INT_VEC4:
+    case GL_UNSIGNED_INT_VEC4:
     case GL_BOOL_VEC4:
     case GL_FLOAT_MAT2:
         return 4;
@@ -174,6 +193,11 @@ void sendValues(const ProgramParameter& first, int count, const float* values, L
         return glProgramUniformMatrix3x4fv(program, location, count, isTransposed, values);
     case GL_FLOAT_MAT4x3:
         return glProgramUniformMatrix4x3fv(program, location, count, isTransposed, values);
+    case GL_UNSIGNED_INT:
+    case GL_UNSIGNED_INT_VEC2:
+    case GL_UNSIGNED_INT_VEC3:
+    case GL_UNSIGNED_INT_VEC4:
+        return sendUnsigned(program, location, first.glType, count, values);
     default:
         return sendInts(program, location, first.glType, count, values);
     }
