@@ -10,7 +10,8 @@ namespace host {
 namespace {
 
 /// A need is met by an OpenGL version, as 10 x major + minor, or by an extension; version 0 never meets it,
-/// because the library calls the entry points that only the extension has.
+/// because the library calls the entry points that only the extension has. Without an extension the version
+/// alone meets it.
 struct Need {
     GlFeature feature;
     int version;
@@ -28,18 +29,23 @@ constexpr Need NEEDS[] = {
     {GlFeature::HALF_FLOATS, 30, "half-float textures", "GL_ARB_texture_float"},
     {GlFeature::HALF_FLOATS, 30, "half-float pixels", "GL_ARB_half_float_pixel"},
     {GlFeature::FRAMEBUFFER_BLIT, 0, "copies between framebuffers", "GL_EXT_framebuffer_blit"},
+    {GlFeature::VERTEX_LISTS, 15, "vertex buffers", "GL_ARB_vertex_buffer_object"},
+    {GlFeature::STRIPS, 0, "primitive restart", "GL_NV_primitive_restart"},
+    {GlFeature::CG_PROGRAMS, 33, "shaders of GLSL 3.30", nullptr},
+    {GlFeature::CG_PROGRAMS, 41, "separate shader programs", "GL_ARB_separate_shader_objects"},
 };
 
 bool isMet(const Need& need) {
     return (need.version != 0 && epoxy_gl_version() >= need.version) ||
-           epoxy_has_gl_extension(need.extension);
+           (need.extension && epoxy_has_gl_extension(need.extension));
 }
 
 std::string describe(const Need& need) {
-    std::string text = std::string(need.what) + " (" + need.extension;
+    std::string means = need.extension ? need.extension : "";
     if (need.version != 0)
-        text += " or OpenGL " + std::to_string(need.version / 10) + '.' + std::to_string(need.version % 10);
-    return text + ')';
+        means += (means.empty() ? "OpenGL " : " or OpenGL ") + std::to_string(need.version / 10) + '.' +
+                 std::to_string(need.version % 10);
+    return std::string(need.what) + " (" + means + ')';
 }
 
 /// Fixed-function state and client arrays are gone from core profiles and from OpenGL ES.
@@ -55,9 +61,15 @@ bool isCompatibilityContext() {
     return (profile & GL_CONTEXT_COMPATIBILITY_PROFILE_BIT) != 0;
 }
 
+std::string driverName() {
+    const auto* const version = reinterpret_cast<const char*>(glGetString(GL_VERSION));
+    const auto* const renderer = reinterpret_cast<const char*>(glGetString(GL_RENDERER));
+    return std::string("OpenGL ") + (version ? version : "?") + " on " + (renderer ? renderer : "?");
+}
+
 } // namespace
 
-std::string missingGlFeatures(std::initializer_list<GlFeature> features) {
+std::string missingGlFeatures(const std::vector<GlFeature>& features) {
     if (!isCompatibilityContext())
         return "an OpenGL compatibility profile";
     std::string missing;
@@ -67,14 +79,19 @@ std::string missingGlFeatures(std::initializer_list<GlFeature> features) {
     return missing;
 }
 
-void requireGlFeatures(std::initializer_list<GlFeature> features) {
+void requireGlFeatures(const std::vector<GlFeature>& features) {
     const std::string missing = missingGlFeatures(features);
     if (missing.empty())
         return;
-    const auto* const version = reinterpret_cast<const char*>(glGetString(GL_VERSION));
-    const auto* const renderer = reinterpret_cast<const char*>(glGetString(GL_RENDERER));
-    throw std::runtime_error(std::string("OpenGL ") + (version ? version : "?") + " on " +
-                             (renderer ? renderer : "?") + " lacks " + missing);
+    throw std::runtime_error(driverName() + " lacks " + missing);
+}
+
+void requireTextureSize(uint32_t width, uint32_t height) {
+    GLint limit = 0;
+    glGetIntegerv(GL_MAX_TEXTURE_SIZE, &limit);
+    if (width > static_cast<uint32_t>(limit) || height > static_cast<uint32_t>(limit))
+        throw std::runtime_error(driverName() + " has no textures of " + std::to_string(width) + " x " +
+                                 std::to_string(height) + "; its limit is " + std::to_string(limit));
 }
 
 } // namespace host

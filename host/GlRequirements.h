@@ -1,8 +1,9 @@
 #ifndef HOST_GLREQUIREMENTS_H
 #define HOST_GLREQUIREMENTS_H
 
-#include <initializer_list>
+#include <cstdint>
 #include <string>
+#include <vector>
 
 namespace host {
 
@@ -14,6 +15,9 @@ enum class GlFeature {
     READBACK_BUFFERS, ///< Texture with isPBO and readback access
     HALF_FLOATS,      ///< Texture with isFp16
     FRAMEBUFFER_BLIT, ///< copying from texture to texture on the GPU, the host's own work
+    VERTEX_LISTS,     ///< VertexList of triangles and lines
+    STRIPS,           ///< VertexList of GL_TRIANGLE_STRIP or GL_POLYGON
+    CG_PROGRAMS,      ///< Shader
 };
 
 /// What the current context lacks for the features, in words, empty when it has all of it: one entry a need,
@@ -21,11 +25,15 @@ enum class GlFeature {
 /// process, so a host asks before it builds its first object.
 ///
 /// Thread: the render thread, with a context current.
-std::string missingGlFeatures(std::initializer_list<GlFeature> features);
+std::string missingGlFeatures(const std::vector<GlFeature>& features);
 
 /// As above, for a host that cannot go on without.
 /// @throw std::runtime_error  something is missing; what() names the driver and what it lacks
-void requireGlFeatures(std::initializer_list<GlFeature> features);
+void requireGlFeatures(const std::vector<GlFeature>& features);
+
+/// Asks whether the current context takes textures and framebuffers of a size.
+/// @throw std::runtime_error  it does not; what() names the driver and its limit
+void requireTextureSize(uint32_t width, uint32_t height);
 
 } // namespace host
 
