@@ -14,6 +14,7 @@ void addPatternVerb(CLI::App& command);
 void addInfoVerb(CLI::App& command);
 void addRoundTripVerb(CLI::App& command);
 void addShaderVerb(CLI::App& command);
+void addPlayVerb(CLI::App& command);
 
 /// The command line asks for what cannot be; what() says it to the user.
 class WrongCall : public std::runtime_error {

@@ -71,6 +71,7 @@ int main(int argc, char** argv) {
         addInfoVerb(command);
         addRoundTripVerb(command);
         addShaderVerb(command);
+        addPlayVerb(command);
         return run(command, argc, argv);
     } catch (const WrongCall& error) {
         return report(error.what(), WRONG_CALL);
