@@ -267,4 +267,21 @@ TEST_F(TextureLayout, AFillThatDoesNotFitClearsTheBuffer) {
     }
 }
 
+TEST_F(TextureLayout, APitchBelowTheWidthNeverPassesTheEndOfTheBuffer) {
+    for (const uint32_t access : {uint32_t{GL_WRITE_ONLY}, uint32_t{GL_READ_ONLY}}) {
+        Texture::TexArgs args = smallArgs();
+        args.pitchInPix = 6;
+        args.bufAlignByte = 1;
+        args.isPBO = true;
+        args.pboAccessType = access;
+        Texture texture(VideoTestImage::COLOUR_MAT_WHITE, args);
+        if (access == GL_WRITE_ONLY)
+            texture.copyHostBufToPBO(0);
+        else
+            texture.readbackPBOToHostBuf(0);
+        texture.setHostBufData(0, 0, 0, 12, 10, 1, 2, 3, 4); // AddressSanitizer sees a byte too many
+        EXPECT_EQ(texture.getHostBufData(0, 5, 9), 0x04010203U);
+    }
+}
+
 } // namespace

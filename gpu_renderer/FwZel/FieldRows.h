@@ -19,11 +19,11 @@ struct FieldRows {
 };
 
 /// Every row of the file, from the top.
-constexpr FieldRows WHOLE_FRAME = {0, 1};
+constexpr FieldRows EVERY_ROW = {0, 1};
 
 /// @param fid  field identifier: 0 even field, 1 odd field, any other whole frame
 constexpr FieldRows fieldRows(uint32_t fid) {
-    return fid > 1 ? WHOLE_FRAME : FieldRows{fid, 2};
+    return fid > 1 ? EVERY_ROW : FieldRows{fid, 2};
 }
 
 #endif

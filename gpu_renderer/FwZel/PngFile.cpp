@@ -107,7 +107,7 @@ PngReading::~PngReading() {
 // The one place that libpng jumps back to. A step has no local with a destructor.
 template <class Step>
 bool PngReading::guarded(Step step) {
-    if (setjmp(png_jmpbuf(mPng)) != 0) { // NOLINT(cert-err52-cpp): libpng's only way to report an error
+    if (setjmp(png_jmpbuf(mPng)) != 0) { // libpng's only way to report an error
         return false;
     }
     step();

@@ -40,7 +40,7 @@ File openFile(const std::string& fileName) {
 }
 
 [[noreturn]] void endProcess() {
-    std::exit(1); // NOLINT(concurrency-mt-unsafe): the documented end of a stream error
+    std::exit(1); // the documented end of a stream error
 }
 
 // Reads up to the delimiter or the end of the file. LINE_TOO_LONG: the line is full; one character
@@ -281,7 +281,7 @@ void fillTextureFromPpmFile(std::string filename, Texture* tex, uint32_t texBufI
         !isSizeAccepted(header)) {
         return;
     }
-    const FieldRows field = tex->getIsInterlaced() ? fieldRows(fid) : WHOLE_FRAME;
+    const FieldRows field = tex->getIsInterlaced() ? fieldRows(fid) : EVERY_ROW;
     const uint32_t texRows = field.inFile(header.height, tex->getHeight());
     const uint32_t fileRows = texRows == 0 ? 0 : field.first + (texRows - 1) * field.step + 1;
     PixelStream stream(file.get(), uint64_t{fileRows} * header.width);

@@ -262,11 +262,14 @@ void Texture::setHostBufData(uint32_t bufNum, int locX, int locY, int sizeX, int
         return;
     const int64_t endX = std::min(int64_t{locX} + sizeX, int64_t{mWidth});
     const int64_t endY = std::min(int64_t{locY} + sizeY, int64_t{mHeight});
+    const int64_t bufferPixels = hostBufBytes() / 4;
     const unsigned char pixel[4] = {b, g, r, a};
     for (int64_t y = std::max(locY, 0); y < endY; ++y) {
-        unsigned char* const row = buffer + static_cast<size_t>(y) * mPitch;
-        for (int64_t x = std::max(locX, 0); x < endX; ++x)
-            std::memcpy(row + 4 * x, pixel, sizeof pixel);
+        const int64_t rowStart = y * mPitchInPix;
+        const int64_t rowEnd =
+            std::min(endX, bufferPixels - rowStart); // a pitch below the width passes the end
+        for (int64_t x = std::max(locX, 0); x < rowEnd; ++x)
+            std::memcpy(buffer + 4 * (rowStart + x), pixel, sizeof pixel);
     }
 }
 
@@ -373,6 +376,10 @@ uint32_t Texture::pixelBytes() const {
     return mHeight * mWidth * mBytePerPix;
 }
 
+uint32_t Texture::copiedBytes() {
+    return std::min(pixelBytes(), hostBufBytes());
+}
+
 void Texture::copyHostBufToGLTex(uint32_t fid) {
     copyHostBufToGLTex(fid, fid);
 }
@@ -429,7 +436,7 @@ void Texture::writePBO(uint32_t fidHostBuf, uint32_t fidPBO) {
     mapPbo(fidPBO);
     const void* const hostBuf = getHostBufPtr(fidHostBuf);
     if (mPboPtrs[bufferIndex(fidPBO)] && hostBuf)
-        std::memcpy(getAlignedPboPtr(fidPBO), hostBuf, pixelBytes());
+        std::memcpy(getAlignedPboPtr(fidPBO), hostBuf, copiedBytes());
     unmapPbo(fidPBO);
 }
 
@@ -469,7 +476,7 @@ void Texture::readbackPBOToHostBuf(uint32_t fidPBO, uint32_t fidHostBuf) {
     const void* const pixels = mPboPtrs[bufferIndex(fidPBO)];
     void* const hostBuf = getHostBufPtr(fidHostBuf);
     if (pixels && hostBuf)
-        std::memcpy(hostBuf, pixels, pixelBytes());
+        std::memcpy(hostBuf, pixels, copiedBytes());
     unmapPbo(fidPBO);
 }
 

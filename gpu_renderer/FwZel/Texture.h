@@ -161,7 +161,8 @@ public:
     // One identifier: the same buffer on both sides. Two: the source first, then the destination. OpenGL
     // moves width x height pixels under the pixel-store state of the host's context; the library sets no row
     // length, so host buffers whose pitch differs from the width move as if their rows were width pixels
-    // long.
+    // long. With a pitch below the width a copy to or from a PBO ends with the host buffer; a texture upload
+    // from such a buffer would read past its end and is the caller's to avoid.
 
     /// Host buffer to texture: specifies the whole level 0 again. Leaves GL_TEXTURE_2D unbound.
     void copyHostBufToGLTex(uint32_t fid);
@@ -223,6 +224,7 @@ private:
     uint32_t bufferIndex(uint32_t fid) const { return fid & (mNumBuffers - 1); }
     bool isWriteAccess() const;
     uint32_t pixelBytes() const;
+    uint32_t copiedBytes();
     uint32_t hostBufBytes();
     bool hostBufFits() const;
 
