@@ -8,9 +8,11 @@
 #include <FwZel/VideoTestImage.h>
 
 #include <cmath>
-#include <cstdlib>
+#include <cstdio>
 #include <fstream>
 #include <regex>
+#include <stdexcept>
+#include <vector>
 
 namespace {
 
@@ -97,19 +99,23 @@ TEST_F(ToolPlay, FilesAreWrittenAndNumberedTheRightWayUp) {
     EXPECT_EQ(readPng(out.path() + "001.png").width, readPng(FWZEL_PICTURES "/mountains.png").width);
 }
 
-TEST_F(ToolPlay, YCbCrBarsBecomeTheBarsInRgb) {
+TEST_F(ToolPlay, YCbCrIsConvertedByBt709) {
     const std::string converted = playRaw("colour-bar-75 " + host("ycbcr_to_rgb.cg")).output;
     ASSERT_EQ(converted.size(), FRAME_BYTES);
-    const std::string bars = pattern("colour-bar-75");
+    const std::string source = pattern("colour-bar-75"); // its bytes taken for Cr, Y', Cb
+    const auto code = [](const std::string& picture, size_t at) {
+        return static_cast<float>(static_cast<unsigned char>(picture[at]));
+    };
     for (uint32_t bar = 0; bar < 8; ++bar) {
         const size_t at = (bar * 9 + 4) * size_t{4};
-        const auto code = [](const std::string& picture, size_t i) {
-            return static_cast<float>(static_cast<unsigned char>(picture[i])) / 255.0F;
-        };
-        // The picture is read as Cr, Y', Cb at studio levels.
-        const float luma = (code(bars, at + 1) * 255 - 16) / 219;
-        const float red = luma + 1.5748F * (code(bars, at) * 255 - 128) / 224;
-        EXPECT_NEAR(code(converted, at), std::fmin(std::fmax(red, 0), 1), 0.005F) << "bar " << bar;
+        const float luma = (code(source, at + 1) - 16) / 219;
+        const float cr = (code(source, at) - 128) / 224;
+        const float cb = (code(source, at + 2) - 128) / 224;
+        const float rgb[] = {luma + 1.5748F * cr, luma - 0.468124F * cr - 0.187324F * cb,
+                             luma + 1.8556F * cb};
+        for (size_t c = 0; c < 3; ++c)
+            EXPECT_NEAR(code(converted, at + c), 255 * std::fmin(std::fmax(rgb[c], 0), 1), 0.6F)
+                << "bar " << bar << ", component " << c;
     }
 }
 
@@ -166,6 +172,47 @@ TEST_F(ToolPlay, StatisticsHaveALineAStageAndWindow) {
         run.output, std::regex("frames 0 to 2: milliseconds, mean, least and most\n(" + stage + "){3}" +
                                "frames 3 to 5: milliseconds, mean, least and most\n(" + stage + "){3}")))
         << run.output << run.remarks;
+}
+
+/// Kibibytes of memory that a process has in use.
+long residentMemory(int pid) {
+    std::ifstream status("/proc/" + std::to_string(pid) + "/status");
+    for (std::string word; status >> word;)
+        if (word == "VmRSS:") {
+            long kibibytes = 0;
+            status >> kibibytes;
+            return kibibytes;
+        }
+    throw std::runtime_error("the process is gone");
+}
+
+// A frame that leaves an OpenGL error behind ends the tool with exit status 1.
+TEST_F(ToolPlay, ThousandFramesTakeNoMoreMemoryThanAFew) {
+    constexpr int FEW = 200;
+    constexpr int MANY = 1100;
+    constexpr int ALL = 1200;
+    constexpr long TOLERANCE = 4096; // KiB: a third of what 900 leaked textures take
+    const TemporaryFile process("pid");
+    const std::string command =
+        "echo $$ >'" + process.path() +
+        "'; ASAN_OPTIONS=\"$ASAN_OPTIONS:detect_leaks=0:quarantine_size_mb=0\" exec '" FWZEL_TOOL
+        "' play combi circle --size 64x64 --fields --buffers 4 --upload producer --frames 600 --overlay "
+        "--box "
+        "-0.5,-0.5,0.5,0.5 --polyline 0,0,0.5,0.5,-0.5,0.5 --move --surface headless --out - 2>/dev/null";
+    std::FILE* const pipe = popen(command.c_str(), "r");
+    ASSERT_NE(pipe, nullptr);
+    std::vector<char> frame(size_t{64} * 64 * 4);
+    std::vector<long> memory;
+    // The pipe holds the tool to a few frames ahead of what is read.
+    for (int count = 1; count <= ALL && std::fread(frame.data(), frame.size(), 1, pipe) == 1; ++count)
+        if (count == FEW || count == MANY) {
+            int pid = 0;
+            std::ifstream(process.path()) >> pid;
+            memory.push_back(residentMemory(pid));
+        }
+    EXPECT_EQ(pclose(pipe), 0);
+    ASSERT_EQ(memory.size(), 2U);
+    EXPECT_LT(memory[1] - memory[0], TOLERANCE) << "KiB, from " << memory[0];
 }
 
 struct Failure {
