@@ -133,12 +133,15 @@ void PlayApplication::draw(int frameIndex) {
     if (!mScene->shapes.isEmpty())
         mScene->shapes.draw(frameIndex);
     mScene->vertexShader.disableProfile();
-    if (!mSettings.hasOverlay)
-        return;
-    std::vector<std::string> lines = {"ms           mean      min      max"};
+    if (mSettings.hasOverlay)
+        host::drawOverlay(surface().getWidth(), surface().getHeight(), mOverlay);
+}
+
+/// Only closed windows are shown: minimum and maximum of the one that runs are not those of the mean.
+void PlayApplication::renewOverlay() {
+    mOverlay = {"ms           mean      min      max"};
     for (const PerfMeasure::ProcTimeData& record : times().records())
-        lines.push_back(lineOf(record));
-    host::drawOverlay(surface().getWidth(), surface().getHeight(), lines);
+        mOverlay.push_back(lineOf(record));
 }
 
 /// As large as the surface lets it be, with the picture's own shape unless another was asked for.
@@ -180,6 +183,8 @@ void PlayApplication::takeFrame(int frameIndex, const std::vector<unsigned char>
 }
 
 void PlayApplication::endFrame(int frameIndex) {
+    if (times().isWindowClosed())
+        renewOverlay();
     if (mSettings.hasStatistics && times().isWindowClosed())
         writeStatistics(frameIndex);
     if (!surface().isWindow())

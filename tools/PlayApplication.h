@@ -13,6 +13,8 @@
 #include <FwZel/VertexListPlane.h>
 
 #include <memory>
+#include <string>
+#include <vector>
 
 /// "fwzel play" as an application of the library: draws pictures on a plane, with boxes and polylines over
 /// them, and writes what was drawn.
@@ -50,12 +52,14 @@ private:
     void toggleHalf();
     void placePlane(int frameIndex);
     void drawPlane(int frameIndex);
+    void renewOverlay();
     void writeStatistics(int frameIndex);
     void setTitle();
 
     PlaySettings mSettings;
     std::unique_ptr<Scene> mScene;
     std::unique_ptr<PlayPicture> mPicture;
+    std::vector<std::string> mOverlay; ///< lines of text
     size_t mPictureIndex = 0;
     uint32_t mShownFrames = 0; ///< of the picture
     Progress mProgress;

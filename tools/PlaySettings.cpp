@@ -18,6 +18,10 @@ namespace {
 constexpr Size DEFAULT_SIZE = {1920, 1080};
 constexpr uint32_t MAX_FRAMES = std::numeric_limits<int>::max();
 
+WrongCall noNumbers(const std::string& option, const std::string& text) {
+    return WrongCall(option + ": \"" + text + "\" is no list of numbers; write it as 0.5,-1,2");
+}
+
 /// Reads "0.5,-1,2".
 std::vector<float> parseNumbers(const std::string& option, const std::string& text) {
     std::vector<float> numbers;
@@ -29,7 +33,7 @@ std::vector<float> parseNumbers(const std::string& option, const std::string& te
         if (isNumber && *end == '\0')
             return numbers;
         if (!isNumber || *end != ',')
-            throw WrongCall(option + ": \"" + text + "\" is no list of numbers; write it as 0.5,-1,2");
+            throw noNumbers(option, text);
         at = end + 1;
     }
 }
