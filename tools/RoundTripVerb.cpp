@@ -9,16 +9,19 @@
 #include <OutputFile.h>
 #include <PngWriter.h>
 
+#include <FwZel/PictureRefusal.h>
 #include <FwZel/TestPatternCatalogue.h>
 
 #include <epoxy/gl.h>
 
 #include <CLI/CLI.hpp>
 
+#include <algorithm>
 #include <chrono>
 #include <filesystem>
 #include <iomanip>
 #include <iostream>
+#include <map>
 #include <memory>
 #include <sstream>
 #include <stdexcept>
@@ -175,6 +178,18 @@ Picture pictureOfPattern(const TestPatternEntry& pattern, const Size& size) {
     return picture;
 }
 
+/// Files of one name in several folders would overwrite one another in the output folder.
+void tellApart(std::vector<Picture>& pictures) {
+    std::map<std::string, int> uses;
+    for (Picture& picture : pictures) {
+        std::replace(picture.name.begin(), picture.name.end(), ' ', '_');
+        const int use = ++uses[picture.name];
+        if (use > 1)
+            picture.name += '-' + std::to_string(use);
+    }
+}
+
+/// @throw std::runtime_error  a file is refused; what() names it and the reason
 std::vector<Picture> picturesOf(const RoundTripOptions& options) {
     const Size size = parseSize("--size", options.size);
     std::vector<Picture> pictures;
@@ -182,6 +197,12 @@ std::vector<Picture> picturesOf(const RoundTripOptions& options) {
         pictures.push_back(pictureOfFile(file, false));
     for (const std::string& file : options.interlacedFiles)
         pictures.push_back(pictureOfFile(file, true));
+    for (const Picture& picture : pictures) {
+        const std::string refusal = pictureRefusal(picture.source.file);
+        if (!refusal.empty())
+            throw std::runtime_error(picture.source.file + ": " + refusal);
+    }
+    tellApart(pictures);
     for (const TestPatternEntry& pattern : testPatternCatalogue())
         pictures.push_back(pictureOfPattern(pattern, size));
     return pictures;
