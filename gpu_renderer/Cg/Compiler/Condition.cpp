@@ -3,6 +3,7 @@
 #include <Cg/Compiler/Diagnostics.h>
 #include <Cg/Compiler/NumberSpelling.h>
 
+#include <algorithm>
 #include <limits>
 #include <string>
 
@@ -217,12 +218,10 @@ private:
         }
         if (first.kind == TokenKind::NUMBER) {
             const NumberSpelling number = readNumber(first.text);
-            const bool isInteger =
-                number.kind == NumberSpelling::Kind::INTEGER || number.kind == NumberSpelling::Kind::UNSIGNED;
-            if (!isInteger || number.length < first.text.size())
-                return fail("expected a whole number");
+            if (number.kind == NumberSpelling::Kind::INVALID || number.length < first.text.size())
+                return fail("expected a number");
             pass();
-            return wrapped(number.integer);
+            return whole(first, number);
         }
         if (!take(TokenKind::LEFT_PAREN))
             return fail("expected a number, a name or '('");
@@ -230,6 +229,17 @@ private:
         if (!take(TokenKind::RIGHT_PAREN))
             return fail("expected ')'");
         return value;
+    }
+
+    /// A condition counts in whole numbers: of `1.5` the 1 is left.
+    std::int64_t whole(const Token& token, const NumberSpelling& number) {
+        if (number.kind == NumberSpelling::Kind::INTEGER || number.kind == NumberSpelling::Kind::UNSIGNED)
+            return wrapped(number.integer);
+        constexpr double LARGEST = 9e18;
+        const auto cut = static_cast<std::int64_t>(std::min(number.value, LARGEST));
+        mDiagnostics.warning(token.location,
+                             inQuotes(token.text) + " in a condition is cut to " + std::to_string(cut));
+        return cut;
     }
 
     const std::vector<Token>& mTokens;
