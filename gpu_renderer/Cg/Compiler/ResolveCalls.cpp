@@ -20,6 +20,7 @@ constexpr int MAX_CALL_DEPTH = 100;
 
 /// One function, for arrays of this many sizes or samplers of this many kinds.
 constexpr std::size_t MAX_INSTANCES = 64;
+constexpr int MAX_DEFAULT_ARGUMENTS = 4096; ///< in a whole program
 
 bool isAnyNull(const std::vector<TypedExpr*>& expressions) {
     return std::find(expressions.begin(), expressions.end(), nullptr) != expressions.end();
@@ -428,16 +429,30 @@ TypedExpr* Resolver::around(TypedExpr* call, const std::vector<TypedExpr*>& befo
     return result;
 }
 
+/// What a call leaves out. It may call functions with default arguments of their own: those are bounded, in
+/// depth and in all, as each call has its own copy.
+TypedExpr* Resolver::defaultArgument(SourceLocation at, const FunctionDecl* declaration, std::size_t index,
+                                     const Type* type) {
+    if (mCallDepth >= MAX_CALL_DEPTH || mDefaultArguments >= MAX_DEFAULT_ARGUMENTS) {
+        mDiagnostics.error(at, "too many default arguments in the calls of " + inQuotes(declaration->name));
+        return nullptr;
+    }
+    Context outer; // it means what it means where it is written
+    std::swap(outer, mContext);
+    mContext.function = outer.function;
+    ++mCallDepth;
+    ++mDefaultArguments;
+    TypedExpr* value = initializer(type, declaration->parameters[index]->initializer);
+    --mCallDepth;
+    std::swap(outer, mContext);
+    return value;
+}
+
 TypedExpr* Resolver::callFunction(SourceLocation at, const FunctionDecl* declaration,
                                   std::vector<TypedExpr*> arguments, TypedExpr* self) {
     const std::vector<const Type*> parameters = signatureOf(declaration).parameters;
     for (std::size_t i = arguments.size(); i < parameters.size(); ++i) {
-        Context outer; // a default argument means what it means where it is written
-        std::swap(outer, mContext);
-        mContext.function = outer.function;
-        const Type* type = parameters[i];
-        TypedExpr* value = initializer(type, declaration->parameters[i]->initializer);
-        std::swap(outer, mContext);
+        TypedExpr* value = defaultArgument(at, declaration, i, parameters[i]);
         if (!value)
             return nullptr;
         arguments.push_back(value);

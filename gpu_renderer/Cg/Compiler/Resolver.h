@@ -156,6 +156,8 @@ private:
                                const std::vector<const FunctionDecl*>& candidates,
                                const std::vector<TypedExpr*>& arguments, bool report);
     int argumentCost(const VariableDecl* parameter, const Type* type, const TypedExpr* argument);
+    TypedExpr* defaultArgument(SourceLocation at, const FunctionDecl* declaration, std::size_t index,
+                               const Type* type);
     TypedExpr* callFunction(SourceLocation at, const FunctionDecl* declaration,
                             std::vector<TypedExpr*> arguments, TypedExpr* self);
     TypedExpr* callBuiltin(SourceLocation at, Name name, const std::vector<TypedExpr*>& arguments,
@@ -210,6 +212,7 @@ private:
 
     Context mContext;
     int mCallDepth = 0;
+    int mDefaultArguments = 0;
 };
 
 } // namespace cg
