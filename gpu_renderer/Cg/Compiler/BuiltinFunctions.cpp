@@ -10,6 +10,7 @@ namespace {
 /// A row as it is written: "result(parameters)". Shared by all operands of a row are one size (1 to 4) and
 /// one scalar kind, the highest of the arguments':
 ///   N number, F floating, I integer, B boolean, each of the shared size; n, f, i, b the same as one scalar;
+///   V the same as F, but never a matrix; N and F may be matrices of one shape, taken row by row;
 ///   F2, I3, ... of a fixed size; 2, 3, 4 and 1: float vectors, whatever the other operands are;
 ///   M a matrix, T its transposed, Q a square one; s1 s2 s3 sR sC samplers, z1 z2 zR those of depths;
 ///   t a text, v nothing; o before a parameter: out.
@@ -71,23 +72,25 @@ constexpr Row CG_ROWS[] = {
     {"cross", "F3(F3,F3)", "cross($0, $1)"},
     {"determinant", "f(Q)", "determinant($0)"},
     {"determinant", "f(f)", "$0"},
-    {"distance", "f(F,F)", "distance($0, $1)"},
-    {"dot", "f(F,F)", "dot($0, $1)"},
+    {"distance", "f(V,V)", "distance($0, $1)"},
+    {"dot", "f(V,V)", "dot($0, $1)"},
     {"dst", "F4(F4,F4)", "cg_dst($0, $1)", "cg_dst"},
-    {"faceforward", "F(F,F,F)", "faceforward($0, $1, $2)"},
+    {"faceforward", "V(V,V,V)", "faceforward($0, $1, $2)"},
     {"inverse", "Q(Q)", "inverse($0)"},
-    {"length", "f(F)", "length($0)"},
+    {"length", "f(V)", "length($0)"},
     {"lit", "F4(f,f,f)", "cg_lit($0, $1, $2)", "cg_lit"},
-    {"normalize", "F(F)", "normalize($0)"},
-    {"reflect", "F(F,F)", "reflect($0, $1)"},
-    {"refract", "F(F,F,f)", "refract($0, $1, $2)"},
+    {"normalize", "V(V)", "normalize($0)"},
+    {"reflect", "V(V,V)", "reflect($0, $1)"},
+    {"refract", "V(V,V,f)", "refract($0, $1, $2)"},
     {"transpose", "T(M)", "transpose($0)"},
 
     // Questions.
     {"all", "b(b)", "$0"},
     {"all", "b(B)", "all($0)"},
+    {"all", "b(M)", "cg_all($0)", "cg_all"},
     {"any", "b(b)", "$0"},
     {"any", "b(B)", "any($0)"},
+    {"any", "b(M)", "cg_any($0)", "cg_any"},
     {"isfinite", "B(F)", "cg_isfinite($0)", "cg_isfinite"},
     {"isinf", "B(F)", "isinf($0)"},
     {"isnan", "B(F)", "isnan($0)"},
@@ -248,7 +251,8 @@ struct Helper {
 };
 
 /// Helper functions. One that names T exists once for each type T that it is called with: B is the same of
-/// bools, N its number of components. A name with a 1 behind it is the one for scalars.
+/// bools, N its number of components. A name with a 1 behind it is the one for scalars. Of a matrix B and N
+/// are those of a row, R is the number of its rows.
 constexpr Helper HELPERS[] = {
     {"cg_fmod", "T cg_fmod(T x, T y) { return x - y * trunc(x / y); }"},
     {"cg_remainder", "T cg_remainder(T x, T y) { return x - y * (x / y); }"},
@@ -292,6 +296,18 @@ constexpr Helper HELPERS[] = {
                   "            b[i] = a[i];\n"
                   "    return b;\n"
                   "}"},
+    {"cg_all", "bool cg_all(T m) {\n"
+               "    bool result = true;\n"
+               "    for (int i = 0; i < R; ++i)\n"
+               "        result = result && all(B(m[i]));\n"
+               "    return result;\n"
+               "}"},
+    {"cg_any", "bool cg_any(T m) {\n"
+               "    bool result = false;\n"
+               "    for (int i = 0; i < R; ++i)\n"
+               "        result = result || any(B(m[i]));\n"
+               "    return result;\n"
+               "}"},
     {"cg_and",
      "T cg_and(T a, T b) {\n    for (int i = 0; i < N; ++i)\n        a[i] = a[i] && b[i];\n    return a;\n}"},
     {"cg_or",
@@ -455,6 +471,10 @@ BuiltinOperand readOperand(const char*& at) {
     case 'F':
         operand.kind = Kind::FLOATING;
         break;
+    case 'V':
+        operand.kind = Kind::FLOATING;
+        operand.isVector = true;
+        break;
     case 'I':
         operand.kind = Kind::INTEGER;
         break;
@@ -544,7 +564,8 @@ std::vector<Name> builtinNames() {
 
 HelperFunction findHelper(Name name, const std::string& type) {
     HelperFunction result;
-    const int size = type.find("vec") == std::string::npos ? 1 : type.back() - '0';
+    const bool isMatrix = type.rfind("mat", 0) == 0;
+    const int size = isMatrix || type.find("vec") != std::string::npos ? type.back() - '0' : 1;
     const Helper* helper = size == 1 ? findRow(std::string(name) + "1") : nullptr;
     if (!helper)
         helper = findRow(name);
@@ -561,11 +582,13 @@ HelperFunction findHelper(Name name, const std::string& type) {
         return !continues(at + 1) && (at == 0 || !continues(at - 1));
     };
     for (std::size_t i = 0; i < text.size(); ++i) {
-        const bool isPlaceholder = (text[i] == 'T' || text[i] == 'B' || text[i] == 'N') && isWord(i);
+        const bool isPlaceholder = Name("TBNR").find(text[i]) != Name::npos && isWord(i);
         if (!isPlaceholder)
             result.text += text[i];
         else if (text[i] == 'N')
             result.text += std::to_string(size);
+        else if (text[i] == 'R')
+            result.text += isMatrix ? type[3] : '1';
         else
             result.text += text[i] == 'T' ? type : bools;
     }

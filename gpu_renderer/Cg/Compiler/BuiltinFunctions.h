@@ -27,8 +27,9 @@ struct BuiltinOperand {
     static constexpr int SHARED = 0;
 
     Kind kind = Kind::VOID;
-    int size = SHARED;    ///< number of components, or the size that the generic operands share
-    bool isFloat = false; ///< FLOATING: always `float`, whatever the other operands are
+    int size = SHARED;     ///< number of components, or the size that the generic operands share
+    bool isFloat = false;  ///< FLOATING: always `float`, whatever the other operands are
+    bool isVector = false; ///< FLOATING: takes no matrix row by row
     bool isOut = false;
     Sampler sampler = Sampler::ANY;
 };
@@ -63,7 +64,7 @@ struct HelperFunction {
 };
 
 /// A helper function that a built-in's GLSL form calls.
-/// @param type  GLSL type of its first operand, `float` to `vec4` or the same of ints or bools
+/// @param type  GLSL type of its first operand: `float` to `vec4`, the same of ints or bools, or `mat2x3`
 HelperFunction findHelper(Name name, const std::string& type);
 
 } // namespace cg

@@ -381,7 +381,7 @@ bool isGlslConstant(const TypedExpr* expression) {
         return expression->variable->storage == Variable::Storage::GLOBAL &&
                expression->variable->isConstantExpression;
     case Kind::BUILTIN:
-        if (expression->operands.empty() || !expression->helper.empty() ||
+        if (expression->operands.empty() || !expression->helper.empty() || expression->isByRows ||
             expression->form.find("texture") != Name::npos || expression->form.find("texel") != Name::npos ||
             expression->form.find("dFd") != Name::npos || expression->form.find("fwidth") != Name::npos)
             return false;

@@ -106,6 +106,19 @@ int flatLength(const Type* type) {
     return length;
 }
 
+/// A form with its operands in place of `$0`, `$1`, ...
+template <class Print>
+std::string filledIn(Name form, const Print& print) {
+    std::string text;
+    for (std::size_t i = 0; i < form.size(); ++i) {
+        if (form[i] == '$' && i + 1 < form.size())
+            text += print(static_cast<std::size_t>(form[++i] - '0'));
+        else
+            text += form[i];
+    }
+    return text;
+}
+
 } // namespace
 
 GlslEmitter::GlslEmitter(const TypedProgram& program, const TypeTable& types, Stage stage,
@@ -265,7 +278,7 @@ std::string GlslEmitter::uniforms() {
     std::string text;
     for (const Variable* uniform : mProgram.uniforms) {
         const std::string name = nameOfVariable(uniform);
-        if (!name.empty() && !uniform->state && !uniform->alias)
+        if (!name.empty() && !uniform->state)
             text += "uniform " + declare(uniform->type, name) + ";\n";
     }
     return text;
@@ -509,6 +522,16 @@ void GlslEmitter::effect(const TypedExpr* expression) {
         effect(expression->operands[1]);
         return;
     }
+    if (expression->kind == Kind::CONDITIONAL && expression->type->isVoid()) {
+        line("if (" + print(expression->operands[0]) + ") {");
+        for (std::size_t i = 1; i < expression->operands.size(); ++i) {
+            ++mIndent;
+            effect(expression->operands[i]);
+            --mIndent;
+            line(i == 1 ? "} else {" : "}");
+        }
+        return;
+    }
     if (expression->kind != Kind::VARIABLE && expression->kind != Kind::LITERAL)
         line(print(expression) + ";");
 }
@@ -657,11 +680,10 @@ std::string GlslEmitter::arguments(const TypedExpr* expression) {
     return text;
 }
 
-std::string GlslEmitter::builtin(const TypedExpr* expression) {
-    for (Name helper = expression->helper; !helper.empty();) {
-        const bool isFirst = helper == expression->helper;
-        const HelperFunction function =
-            findHelper(helper, isFirst ? typeName(expression->operands[0]->type) : "float");
+/// @param type  that of the helper's first operand
+void GlslEmitter::addHelper(Name helper, const std::string& type) {
+    for (bool isFirst = true; !helper.empty(); isFirst = false) {
+        const HelperFunction function = findHelper(helper, isFirst ? type : "float");
         if (!mKnownHelpers.insert(function.text).second)
             break;
         mHelpers.push_back(function.text);
@@ -670,15 +692,57 @@ std::string GlslEmitter::builtin(const TypedExpr* expression) {
             std::rotate(mHelpers.rbegin(), mHelpers.rbegin() + 1, mHelpers.rbegin() + 2);
         helper = function.needs;
     }
-    std::string text;
-    const Name form = expression->form;
-    for (std::size_t i = 0; i < form.size(); ++i) {
-        if (form[i] == '$' && i + 1 < form.size())
-            text += print(expression->operands[static_cast<std::size_t>(form[++i] - '0')], ASSIGN_LEVEL);
-        else
-            text += form[i];
+}
+
+std::string GlslEmitter::builtin(const TypedExpr* expression) {
+    if (expression->isByRows)
+        return byRows(expression);
+    if (!expression->helper.empty())
+        addHelper(expression->helper, typeName(expression->operands[0]->type));
+    return filledIn(expression->form,
+                    [&](std::size_t operand) { return print(expression->operands[operand], ASSIGN_LEVEL); });
+}
+
+/// GLSL's functions take vectors: one of our own applies them to each row of its matrices.
+std::string GlslEmitter::byRows(const TypedExpr* expression) {
+    const auto& operands = expression->operands;
+    const auto nameOfOperand = [](std::size_t i) { return std::string(1, static_cast<char>('a' + i)); };
+    int rows = 0;
+    std::string parameters;
+    for (std::size_t i = 0; i < operands.size(); ++i) {
+        const Type* type = operands[i]->type;
+        if (type->isMatrix())
+            rows = type->rows;
+        parameters += (i == 0 ? "" : ", ") +
+                      std::string((expression->outOperands >> i & 1U) != 0 ? "out " : "") +
+                      declare(type, nameOfOperand(i));
     }
-    return text;
+    if (!expression->helper.empty()) {
+        const Type* first = operands[0]->type;
+        addHelper(expression->helper,
+                  typeName(first->isMatrix() ? mTypes.vector(first->scalar, first->columns) : first));
+    }
+    const bool isVoid = expression->type->isVoid();
+    std::string body = isVoid ? "" : "    return " + typeName(expression->type) + "(";
+    for (int row = 0; row < rows; ++row) {
+        const std::string call = filledIn(expression->form, [&](std::size_t operand) {
+            const bool isMatrix = operands[operand]->type->isMatrix();
+            return nameOfOperand(operand) + (isMatrix ? "[" + std::to_string(row) + "]" : "");
+        });
+        if (isVoid)
+            body += "    " + call + ";\n";
+        else
+            body += (row == 0 ? "" : ", ") + call;
+    }
+    if (!isVoid)
+        body += ");\n";
+    const std::string rest = "(" + parameters + ") {\n" + body + "}";
+    std::string& name = mRowFunctions[typeName(expression->type) + rest];
+    if (name.empty()) {
+        name = "cg_rows" + std::to_string(mRowFunctions.size());
+        mHelpers.push_back(typeName(expression->type) + " " + name + rest);
+    }
+    return name + "(" + arguments(expression) + ")";
 }
 
 std::string GlslEmitter::construct(const TypedExpr* expression) {

@@ -51,6 +51,8 @@ private:
     std::string printed(const TypedExpr* expression, int& precedence);
     std::string literal(const TypedExpr* expression, int& precedence) const;
     std::string builtin(const TypedExpr* expression);
+    std::string byRows(const TypedExpr* expression);
+    void addHelper(Name helper, const std::string& type);
     std::string arguments(const TypedExpr* expression);
     std::string construct(const TypedExpr* expression);
     std::string convert(const TypedExpr* expression, int& precedence);
@@ -79,6 +81,7 @@ private:
     std::unordered_map<const StructType*, std::vector<std::string>> mMemberNames;
     std::vector<std::string> mHelpers;
     std::unordered_set<std::string> mKnownHelpers;
+    std::unordered_map<std::string, std::string> mRowFunctions; ///< names, by what else there is of them
     std::string mText;
     int mIndent = 0;
 };

@@ -5,6 +5,7 @@
 #include <Cg/Compiler/Diagnostics.h>
 
 #include <algorithm>
+#include <array>
 #include <cctype>
 #include <numeric>
 #include <string>
@@ -39,7 +40,11 @@ bool isSameInGlsl(const Type* a, const Type* b) {
            a->columns == b->columns && isFloating(a->scalar) && isFloating(b->scalar);
 }
 
-bool isNamedAsShadow(const TypedExpr* sampler) {
+bool isNamedAsShadow(TypedExpr* sampler) {
+    if (sampler->kind == Kind::CONDITIONAL) {
+        const std::vector<TypedExpr*> samplers = samplersIn(sampler);
+        return std::any_of(samplers.begin(), samplers.end(), isNamedAsShadow);
+    }
     const Variable* root = rootVariable(sampler);
     if (!root)
         return false;
@@ -374,7 +379,8 @@ TypedExpr* Resolver::passArgument(TypedExpr* argument, const Type* type, Directi
     for (TypedExpr* part : isElements ? argument->operands : std::vector<TypedExpr*>{argument})
         if (!checkAssignable(at, part))
             return nullptr;
-    if (!isElements && argument->kind != Kind::CONVERT &&
+    const bool isRow = argument->kind == Kind::ELEMENT && type->isArray();
+    if (!isElements && !isRow && argument->kind != Kind::CONVERT &&
         (isSameInGlsl(argument->type, type) || !type->isNumeric()))
         return argument;
     Variable* place = temporary(type);
@@ -396,7 +402,7 @@ TypedExpr* Resolver::passArgument(TypedExpr* argument, const Type* type, Directi
         TypedExpr* back = mBuild.convert(result, argument->type);
         if (!back)
             return nullptr;
-        after.push_back(mBuild.assign(at, argument, back));
+        after.push_back(isRow ? assignRow(at, argument, back) : mBuild.assign(at, argument, back));
         return result;
     }
     for (std::size_t i = 0; i < argument->operands.size(); ++i)
@@ -448,6 +454,80 @@ TypedExpr* Resolver::defaultArgument(SourceLocation at, const FunctionDecl* decl
     return value;
 }
 
+/// A call of a function that gives a sampler: GLSL has none, so what it chooses is put in place of the call.
+TypedExpr* Resolver::chosenSampler(SourceLocation at, const FunctionDecl* declaration,
+                                   const std::vector<TypedExpr*>& arguments) {
+    const FunctionDecl* definition = definitionOf(declaration);
+    if (!definition || mCallDepth >= MAX_CALL_DEPTH) {
+        mDiagnostics.error(at, inQuotes(declaration->name) +
+                                   (definition ? " calls itself" : " is declared but not defined"));
+        return nullptr;
+    }
+    const std::vector<const Type*> parameters = signatureOf(definition).parameters;
+    Context inner;
+    inner.function = mContext.function;
+    inner.statements = mContext.statements;
+    inner.ordinal = mOrdinals[definition];
+    for (std::size_t i = 0; i < arguments.size(); ++i) {
+        const VariableDecl* parameter = definition->parameters[i];
+        Variable* variable =
+            makeVariable(Variable::Storage::LOCAL, parameter->name, parameters[i], parameter);
+        variable->alias = mBuild.convert(arguments[i], parameters[i]);
+        if (!variable->alias)
+            return nullptr;
+        if (hasEffect(variable->alias) || directionOf(parameter) != Direction::IN) {
+            mDiagnostics.error(arguments[i]->location,
+                               "a function that gives a sampler takes only values to choose by");
+            return nullptr;
+        }
+        inner.scope.push_back({parameter->name, variable, nullptr});
+    }
+    std::swap(inner, mContext);
+    ++mCallDepth;
+    std::size_t ways = 0;
+    TypedExpr* sampler = chosenSampler(definition, definition->body->statements, ways);
+    --mCallDepth;
+    std::swap(inner, mContext);
+    return sampler;
+}
+
+/// What statements give, one after another.
+/// @param ways  counts the ways through the function
+TypedExpr* Resolver::chosenSampler(const FunctionDecl* definition, const std::vector<Stmt*>& body,
+                                   std::size_t& ways) {
+    const auto after = [&body](const std::vector<Stmt*>& first) {
+        std::vector<Stmt*> statements = first;
+        statements.insert(statements.end(), body.begin() + 1, body.end());
+        return statements;
+    };
+    const Stmt* stmt = body.empty() ? nullptr : body[0];
+    if (++ways > 2 * MAX_SAMPLER_CHOICES) {
+        mDiagnostics.error(definition->location, "too many ways through a function that gives a sampler");
+        return nullptr;
+    }
+    if (stmt && stmt->kind == Stmt::Kind::BLOCK)
+        return chosenSampler(definition, after(static_cast<const BlockStmt*>(stmt)->statements), ways);
+    if (stmt && stmt->kind == Stmt::Kind::RETURN && static_cast<const JumpStmt*>(stmt)->value) {
+        TypedExpr* value = expression(static_cast<const JumpStmt*>(stmt)->value);
+        return value ? mBuild.convert(value, signatureOf(definition).result) : nullptr;
+    }
+    if (stmt && stmt->kind == Stmt::Kind::IF) {
+        const auto* branch = static_cast<const IfStmt*>(stmt);
+        TypedExpr* condition = expression(branch->condition);
+        std::array<TypedExpr*, 2> values{};
+        Stmt* const branches[] = {branch->thenBranch, branch->elseBranch};
+        for (std::size_t i = 0; i < values.size(); ++i)
+            values[i] = chosenSampler(definition, branches[i] ? after({branches[i]}) : after({}), ways);
+        return condition && values[0] && values[1]
+                   ? mBuild.conditional(stmt->location, condition, values[0], values[1])
+                   : nullptr;
+    }
+    mDiagnostics.error(stmt ? stmt->location : definition->location,
+                       stmt ? "a function that gives a sampler can hold only 'if' and 'return'"
+                            : "a way through this function gives no sampler");
+    return nullptr;
+}
+
 TypedExpr* Resolver::callFunction(SourceLocation at, const FunctionDecl* declaration,
                                   std::vector<TypedExpr*> arguments, TypedExpr* self) {
     const std::vector<const Type*> parameters = signatureOf(declaration).parameters;
@@ -457,6 +537,8 @@ TypedExpr* Resolver::callFunction(SourceLocation at, const FunctionDecl* declara
             return nullptr;
         arguments.push_back(value);
     }
+    if (isOpaque(signatureOf(declaration).result))
+        return chosenSampler(at, declaration, arguments);
     std::vector<const Type*> types;
     for (std::size_t i = 0; i < parameters.size(); ++i) {
         const Type* argument = arguments[i]->type;
@@ -490,8 +572,7 @@ TypedExpr* Resolver::callFunction(SourceLocation at, const FunctionDecl* declara
         if (isOpaque(parameter->type)) {
             const Type* type = parameter->type;
             agree(sources[i], type->isArray() ? type->element : type);
-            const Variable* source = rootVariable(sources[i]);
-            if (parameter->comparesDepth && source && mPlainSamplers.count(source->name) != 0)
+            if (parameter->comparesDepth && isPlainSampler(sources[i]))
                 mPlainSamplers.insert(parameter->name);
         }
         TypedExpr* passed = passArgument(sources[i], parameter->type, parameter->direction, before, after);
@@ -515,40 +596,103 @@ TypedExpr* Resolver::callFunction(SourceLocation at, const FunctionDecl* declara
             result->operands.push_back(found->second->alias);
         }
     }
-    return withKnownSampler(around(result, before, after));
+    result = withKnownSampler(result);
+    return result ? around(result, before, after) : nullptr;
 }
 
-/// GLSL indexes arrays of samplers by constants only: a choice among them becomes a choice among calls.
+bool Resolver::isPlainSampler(TypedExpr* sampler) const {
+    const std::vector<TypedExpr*> samplers = samplersIn(sampler);
+    return std::any_of(samplers.begin(), samplers.end(), [this](const TypedExpr* one) {
+        const Variable* root = rootVariable(one);
+        return root && mPlainSamplers.count(root->name) != 0;
+    });
+}
+
+/// GLSL knows no choice among samplers and indexes arrays of them by constants only: it becomes a choice
+/// among calls.
 TypedExpr* Resolver::withKnownSampler(TypedExpr* call) {
     for (std::size_t i = 0; i < call->operands.size(); ++i) {
         TypedExpr* operand = call->operands[i];
-        if (operand->kind != Kind::ELEMENT || !operand->type->isSampler())
+        if (!operand->type->isSampler())
+            continue;
+        if (operand->kind == Kind::CONDITIONAL)
+            return chooseCall(call, i);
+        if (operand->kind != Kind::ELEMENT)
             continue;
         TypedExpr* index = operand->operands[1];
-        if (const auto value = constantValue(index)) {
+        if (const auto value = constantValue(index))
             operand->operands[1] = mBuild.literal(index->location, index->type, (*value)[0]);
-            continue;
-        }
-        const int length = operand->operands[0]->type->length;
-        if (call->type->isVoid() || length > 64) {
-            mDiagnostics.error(call->location, "an array of samplers wants a constant index here");
-            return nullptr;
-        }
-        TypedExpr* preparation = nullptr;
-        TypedExpr* position = once(index, preparation);
-        TypedExpr* result = nullptr;
-        for (int element = length - 1; element >= 0; --element) {
-            TypedExpr* choice = mArena.make<TypedExpr>(*call);
-            choice->operands[i] = mBuild.element(operand->location, operand->operands[0], element);
-            TypedExpr* number = mBuild.literal(index->location, mTypes.scalar(Scalar::INT), element);
-            result = result ? mBuild.make(Kind::CONDITIONAL, call->location, call->type,
-                                          {mBuild.binary(index->location, BinaryOp::EQUAL, position, number),
-                                           choice, result})
-                            : choice;
-        }
-        return preparation ? mBuild.comma(call->location, preparation, result) : result;
+        else
+            return chooseCallByIndex(call, i);
     }
     return call;
+}
+
+/// Makes sure that the operands can be written several times.
+/// @param position  of the sampler, which is left as it is
+TypedExpr* Resolver::withSimpleOperands(TypedExpr* call, std::size_t position) {
+    TypedExpr* preparations = nullptr;
+    for (std::size_t i = 0; i < call->operands.size(); ++i) {
+        const bool isOut = call->kind == Kind::CALL
+                               ? call->function->parameters[i]->direction != Direction::IN
+                               : (call->outOperands >> i & 1U) != 0;
+        TypedExpr* preparation = nullptr;
+        if (i != position && !isOut && !isOpaque(call->operands[i]->type) &&
+            !constantValue(call->operands[i]))
+            call->operands[i] = once(call->operands[i], preparation);
+        if (preparation)
+            preparations =
+                preparations ? mBuild.comma(call->location, preparations, preparation) : preparation;
+    }
+    return preparations;
+}
+
+/// `look(c ? a : b)` as `c ? look(a) : look(b)`
+TypedExpr* Resolver::chooseCall(TypedExpr* call, std::size_t position) {
+    TypedExpr* preparation = withSimpleOperands(call, position);
+    const TypedExpr* choice = call->operands[position];
+    std::array<TypedExpr*, 2> calls{};
+    for (std::size_t i = 0; i < calls.size(); ++i) {
+        TypedExpr* copy = mArena.make<TypedExpr>(*call);
+        copy->operands[position] = choice->operands[i + 1];
+        calls[i] = withKnownSampler(copy);
+        if (!calls[i])
+            return nullptr;
+    }
+    TypedExpr* result =
+        mBuild.make(Kind::CONDITIONAL, call->location, call->type, {choice->operands[0], calls[0], calls[1]});
+    return preparation ? mBuild.comma(call->location, preparation, result) : result;
+}
+
+TypedExpr* Resolver::chooseCallByIndex(TypedExpr* call, std::size_t position) {
+    const TypedExpr* element = call->operands[position];
+    TypedExpr* index = element->operands[1];
+    const int length = element->operands[0]->type->length;
+    if (length > static_cast<int>(MAX_SAMPLER_CHOICES)) {
+        mDiagnostics.error(call->location, "an array of samplers wants a constant index here");
+        return nullptr;
+    }
+    TypedExpr* preparation = withSimpleOperands(call, position);
+    TypedExpr* indexPreparation = nullptr;
+    TypedExpr* known = once(index, indexPreparation);
+    if (indexPreparation)
+        preparation =
+            preparation ? mBuild.comma(call->location, preparation, indexPreparation) : indexPreparation;
+    TypedExpr* result = nullptr;
+    for (int i = length - 1; i >= 0; --i) {
+        TypedExpr* copy = mArena.make<TypedExpr>(*call);
+        copy->operands[position] = mBuild.element(element->location, element->operands[0], i);
+        copy = withKnownSampler(copy);
+        if (!copy)
+            return nullptr;
+        TypedExpr* number = mBuild.literal(index->location, mTypes.scalar(Scalar::INT), i);
+        result =
+            result
+                ? mBuild.make(Kind::CONDITIONAL, call->location, call->type,
+                              {mBuild.binary(index->location, BinaryOp::EQUAL, known, number), copy, result})
+                : copy;
+    }
+    return preparation ? mBuild.comma(call->location, preparation, result) : result;
 }
 
 // ---------------------------------------------------------------------------------- built-in functions
@@ -562,6 +706,8 @@ struct Binding {
     int size = 1;
     Scalar scalar = Scalar::BOOL;
     const Type* matrix = nullptr;
+    int rows = 0; ///< of generic operands that are matrices; 0 where they are none
+    int columns = 0;
 };
 
 bool isGeneric(const Operand& operand) {
@@ -570,6 +716,8 @@ bool isGeneric(const Operand& operand) {
 }
 
 const Type* typeFor(const Operand& operand, const Binding& binding, const TypeTable& types) {
+    if (binding.rows > 0 && isGeneric(operand) && operand.size == Operand::SHARED)
+        return types.matrix(binding.scalar, binding.rows, binding.columns);
     const int size = operand.size == Operand::SHARED ? binding.size : operand.size;
     switch (operand.kind) {
     case Operand::Kind::VOID:
@@ -596,8 +744,42 @@ const Type* typeFor(const Operand& operand, const Binding& binding, const TypeTa
     return nullptr;
 }
 
+/// Takes matrices for generic operands: of the smallest shape, and only where the function works by
+/// component.
+bool bindMatrices(const BuiltinFunction& function, const std::vector<TypedExpr*>& arguments,
+                  Binding& binding) {
+    for (std::size_t i = 0; i < arguments.size(); ++i) {
+        const Type* type = arguments[i]->type;
+        const Operand& operand = function.parameters[i];
+        if (!isGeneric(operand) || operand.size != Operand::SHARED || !type->isMatrix() ||
+            type->isThinMatrix())
+            continue;
+        const bool isFirst = binding.rows == 0;
+        binding.rows = isFirst ? type->rows : std::min(binding.rows, type->rows);
+        binding.columns = isFirst ? type->columns : std::min(binding.columns, type->columns);
+    }
+    if (binding.rows == 0)
+        return true;
+    if (binding.rows == 1 || binding.columns == 1)
+        return false;
+    for (std::size_t i = 0; i < arguments.size(); ++i) {
+        const Type* type = arguments[i]->type;
+        const Operand& operand = function.parameters[i];
+        const bool isShared = isGeneric(operand) && operand.size == Operand::SHARED;
+        const bool isByComponent =
+            (operand.kind == Operand::Kind::NUMBER || operand.kind == Operand::Kind::FLOATING) &&
+            !operand.isVector;
+        const bool isScalarOrMatrix = type->isScalar() || (type->isMatrix() && !type->isThinMatrix());
+        if (isShared && (!isByComponent || !isScalarOrMatrix))
+            return false;
+    }
+    return true;
+}
+
 /// Finds what the generic operands are: the smallest vector's size, the highest scalar kind.
 bool bind(const BuiltinFunction& function, const std::vector<TypedExpr*>& arguments, Binding& binding) {
+    if (!bindMatrices(function, arguments, binding))
+        return false;
     int smallest = 0;
     bool hasTyped = false;
     for (std::size_t i = 0; i < arguments.size(); ++i) {
@@ -611,7 +793,8 @@ bool bind(const BuiltinFunction& function, const std::vector<TypedExpr*>& argume
         }
         if (!isGeneric(operand))
             continue;
-        if (!type->isNumeric() || (type->isMatrix() && !type->isThinMatrix()))
+        const bool isMatrix = type->isMatrix() && !type->isThinMatrix();
+        if (!type->isNumeric() || (isMatrix && operand.size != Operand::SHARED))
             return false;
         const bool decidesSize = operand.size == Operand::SHARED && type->components() > 1;
         if (decidesSize && (smallest == 0 || type->components() < smallest))
@@ -710,8 +893,7 @@ TypedExpr* Resolver::callBuiltin(SourceLocation at, Name name, const std::vector
             int cost = mBuild.cost(arguments[i], type);
             if (operand.kind == Operand::Kind::SAMPLER) {
                 comparesDepth = isDepthSampler(operand.sampler);
-                const Variable* root = rootVariable(arguments[i]);
-                const bool isPlain = root && mPlainSamplers.count(root->name) != 0;
+                const bool isPlain = isPlainSampler(arguments[i]);
                 if (comparesDepth &&
                     (isPlain || (function.needsShadowName && !isNamedAsShadow(arguments[i]))))
                     cost = TypedBuilder::IMPOSSIBLE;
@@ -789,8 +971,17 @@ TypedExpr* Resolver::callBuiltin(SourceLocation at, Name name, const std::vector
     if (form == "$0") {
         result = expansion.operands[0];
     } else {
-        const Name kept = expansion.form == best->form ? best->form : mArena.keep(expansion.form);
-        result = mBuild.builtin(at, resultType, kept, expansion.operands, best->helper);
+        result = bestBinding.rows > 0 && best->result.kind == Operand::Kind::BOOLEAN
+                     ? mBuild.asksRows(at, resultType, expansion.form, expansion.operands)
+                     : mBuild.builtin(at, resultType,
+                                      expansion.form == best->form ? best->form : mArena.keep(expansion.form),
+                                      expansion.operands);
+        result->helper = best->helper;
+        result->isByRows = bestBinding.rows > 0;
+        for (std::size_t i = 0; i < passed.size(); ++i)
+            for (std::size_t j = 0; best->parameters[i].isOut && j < expansion.operands.size(); ++j)
+                if (expansion.operands[j] == passed[i])
+                    result->outOperands |= 1U << j;
         result->isUntyped =
             std::all_of(passed.begin(), passed.end(), [](const TypedExpr* e) { return e->isUntyped; });
     }

@@ -12,7 +12,6 @@ namespace cg {
 
 namespace {
 
-constexpr int MAX_ARRAY_LENGTH = 65536;
 constexpr int MAX_LEAVES = 1 << 18; ///< components of one variable
 
 std::string upper(Name text) {
@@ -116,20 +115,25 @@ const Type* Resolver::typeOf(const TypeSyntax* syntax) {
         mDiagnostics.error(syntax->location, "unknown type " + inQuotes(syntax->name));
         return nullptr;
     }
-    return withDimensions(type, syntax->dimensions);
+    return withDimensions(syntax->location, type, syntax->dimensions);
 }
 
 const Type* Resolver::typeOf(const TypeSyntax* syntax, const std::vector<Expr*>& dimensions) {
     const Type* type = typeOf(syntax);
-    type = type ? withDimensions(type, dimensions) : nullptr;
+    type = type ? withDimensions(syntax->location, type, dimensions) : nullptr;
     return type ? checkSize(syntax->location, type) : nullptr;
 }
 
-const Type* Resolver::withDimensions(const Type* type, const std::vector<Expr*>& dimensions) {
+const Type* Resolver::withDimensions(SourceLocation at, const Type* type,
+                                     const std::vector<Expr*>& dimensions) {
     for (auto it = dimensions.rbegin(); it != dimensions.rend(); ++it) {
         const int length = *it ? arrayLength(*it) : Type::UNSIZED;
         if (length == 0)
             return nullptr;
+        if (type->isArray() && type->length == Type::UNSIZED) {
+            mDiagnostics.error(at, "only the first size of an array can be left open");
+            return nullptr;
+        }
         type = mTypes.array(type, length);
     }
     return type;
@@ -255,12 +259,15 @@ void Resolver::resolveGlobal(Variable* variable, const VariableDecl* declaration
         if (!value)
             return;
     }
-    if (type->isVoid() || (type->isArray() && type->length == Type::UNSIZED && !containsSampler(type))) {
+    const bool isUnsized = type->isArray() && type->length == Type::UNSIZED;
+    if (type->isVoid() ||
+        (isUnsized && (declaration->qualifiers.isStatic || declaration->qualifiers.isConst))) {
         mDiagnostics.error(declaration->location,
                            inQuotes(declaration->name) + " cannot be '" + nameOf(type) + "'");
         return;
     }
     variable->type = type;
+    variable->isUnsized = isUnsized;
     variable->initializer = value;
     const Qualifiers& qualifiers = declaration->qualifiers;
     const bool isUniform =
@@ -540,7 +547,8 @@ void Resolver::resolveEntry(const FunctionDecl* declaration) {
             continue;
         if (parameter->initializer && type->isArray() && type->length == Type::UNSIZED)
             initializer(type, parameter->initializer);
-        if (!type || (type->isVoid() || (type->isArray() && type->length == Type::UNSIZED))) {
+        const bool isUnsized = type && type->isArray() && type->length == Type::UNSIZED;
+        if (!type || type->isVoid() || (isUnsized && !isUniformParameter(parameter, type))) {
             mDiagnostics.error(parameter->location,
                                "parameter " + inQuotes(parameter->name) + " of the entry needs a known size");
             continue;

@@ -187,9 +187,18 @@ TypedExpr* Resolver::useVariable(SourceLocation at, Variable* variable) {
     return mBuild.variable(at, variable);
 }
 
+/// Of a uniform array without a size only elements can be used: it is as long as they ask for.
+TypedExpr* Resolver::useName(const NameExpr* expr, Variable* variable) {
+    if (!variable->isUnsized || mIndexed == expr)
+        return useVariable(expr->location, variable);
+    mDiagnostics.error(expr->location,
+                       inQuotes(expr->name) + " has no size: it can be used element by element only");
+    return nullptr;
+}
+
 TypedExpr* Resolver::name(const NameExpr* expr) {
     if (Variable* variable = findVariable(expr->name))
-        return useVariable(expr->location, variable);
+        return useName(expr, variable);
     if (mContext.self) {
         TypedExpr* self = mBuild.variable(expr->location, mContext.self);
         if (expr->name == "this")
@@ -200,7 +209,7 @@ TypedExpr* Resolver::name(const NameExpr* expr) {
     const auto global = mGlobalDecls.find(expr->name);
     if (global != mGlobalDecls.end()) {
         Variable* variable = globalVariable(global->second);
-        return variable ? useVariable(expr->location, variable) : nullptr;
+        return variable ? useName(expr, variable) : nullptr;
     }
     if (Variable* variable = outliveLoop(expr->location, expr->name))
         return useVariable(expr->location, variable);
@@ -319,6 +328,7 @@ TypedExpr* Resolver::matrixElements(SourceLocation at, TypedExpr* matrix, Name n
 TypedExpr* Resolver::index(const IndexExpr* expr) {
     if (TypedExpr* state = stateVariable(expr))
         return state;
+    mIndexed = expr->object;
     TypedExpr* object = expression(expr->object);
     TypedExpr* position = expression(expr->index);
     return object && position ? elementOf(expr->location, object, position) : nullptr;
@@ -338,6 +348,8 @@ TypedExpr* Resolver::elementOf(SourceLocation at, TypedExpr* object, TypedExpr* 
         return nullptr;
     const int length = type->isArray() ? type->length : type->isMatrix() ? type->rows : type->columns;
     const auto position = constantValue(index);
+    if (object->kind == Kind::VARIABLE && object->variable->isUnsized)
+        return elementOfUnsized(at, object, index);
     if (position && length != Type::UNSIZED && ((*position)[0] < 0 || (*position)[0] >= length)) {
         mDiagnostics.error(index->location, "index " +
                                                 std::to_string(static_cast<long long>((*position)[0])) +
@@ -347,6 +359,22 @@ TypedExpr* Resolver::elementOf(SourceLocation at, TypedExpr* object, TypedExpr* 
     if (position && type->isVector())
         return mBuild.swizzle(at, object, {static_cast<int>((*position)[0])});
     return mBuild.element(at, object, index);
+}
+
+TypedExpr* Resolver::elementOfUnsized(SourceLocation at, TypedExpr* array, TypedExpr* index) {
+    Variable* variable = array->variable;
+    const auto position = constantValue(index);
+    if (!position || (*position)[0] < 0 || (*position)[0] >= MAX_ARRAY_LENGTH) {
+        mDiagnostics.error(index->location, inQuotes(variable->name) + " has no size: the index must be a "
+                                                                       "constant");
+        return nullptr;
+    }
+    const int length = std::max(variable->type->length, static_cast<int>((*position)[0]) + 1);
+    const Type* type = checkSize(at, mTypes.array(variable->type->element, length));
+    if (!type)
+        return nullptr;
+    array->type = variable->type = type;
+    return mBuild.element(at, array, index);
 }
 
 // ---------------------------------------------------------------------------------------- construction
@@ -505,6 +533,8 @@ TypedExpr* Resolver::assignment(const AssignExpr* expr) {
         value = mBuild.convert(value, target->type);
         if (!value)
             return nullptr;
+        if (target->kind == Kind::ELEMENT && target->type->isArray())
+            return assignRow(at, target, value);
         if (containsSampler(target->type))
             aliasSamplers(at, target, value);
         return mBuild.assign(at, target, value);
@@ -518,6 +548,27 @@ TypedExpr* Resolver::assignment(const AssignExpr* expr) {
     TypedExpr* result = mBuild.assign(at, target, isPlain ? combined->operands[1] : combined);
     result->isCompound = isPlain;
     result->binary = expr->op;
+    return result;
+}
+
+/// A whole row of an array of arrays, which is flat in GLSL: each element by itself.
+TypedExpr* Resolver::assignRow(SourceLocation at, TypedExpr* target, TypedExpr* value) {
+    TypedExpr* result = nullptr;
+    const auto then = [&](TypedExpr* next) { result = result ? mBuild.comma(at, result, next) : next; };
+    TypedExpr* preparation = nullptr;
+    value = once(value, preparation);
+    if (preparation)
+        then(preparation);
+    preparation = nullptr;
+    target = mBuild.make(Kind::ELEMENT, at, target->type,
+                         {target->operands[0], once(target->operands[1], preparation)});
+    if (preparation)
+        then(preparation);
+    for (int i = 0; i < target->type->length; ++i) {
+        TypedExpr* element = mBuild.element(at, target, i);
+        TypedExpr* source = mBuild.element(at, value, i);
+        then(element->type->isArray() ? assignRow(at, element, source) : mBuild.assign(at, element, source));
+    }
     return result;
 }
 
@@ -634,9 +685,38 @@ TypedExpr* Resolver::assignSampler(SourceLocation at, TypedExpr* target, TypedEx
         mDiagnostics.error(at, "cannot assign '" + nameOf(value->type) + "' to this sampler");
         return nullptr;
     }
+    TypedExpr* preparation = nullptr;
     if (rootVariable(value) != root)
-        root->alias = value;
-    return nothing(at);
+        alias(root, frozen(value, preparation));
+    return preparation ? preparation : nothing(at);
+}
+
+/// From now on the variable stands for another sampler.
+void Resolver::alias(Variable* variable, TypedExpr* sampler) {
+    mAliased.push_back({variable, variable->alias});
+    variable->alias = sampler;
+}
+
+/// The sampler as it is chosen now, whatever becomes of what it is chosen by.
+/// @param preparation  receives what keeps that, or nothing
+TypedExpr* Resolver::frozen(TypedExpr* sampler, TypedExpr*& preparation) {
+    const bool isChoice = sampler->kind == Kind::CONDITIONAL;
+    if (!isChoice && sampler->kind != Kind::ELEMENT)
+        return sampler;
+    TypedExpr* result = mArena.make<TypedExpr>(*sampler);
+    TypedExpr*& decision = result->operands[isChoice ? 0 : 1];
+    if (!constantValue(decision)) {
+        const SourceLocation at = decision->location;
+        Variable* place = makeVariable(Variable::Storage::LOCAL, "choice", decision->type, nullptr);
+        mProgram->temporaries.push_back(place); // other functions may look up the sampler, too
+        TypedExpr* keep = mBuild.assign(at, mBuild.variable(at, place), decision);
+        preparation = preparation ? mBuild.comma(at, preparation, keep) : keep;
+        decision = mBuild.variable(at, place);
+    }
+    if (isChoice)
+        for (std::size_t i = 1; i < result->operands.size(); ++i)
+            result->operands[i] = frozen(result->operands[i], preparation);
+    return result;
 }
 
 /// The samplers of a struct that is copied: those of the copy stand for those of the original.
@@ -667,12 +747,18 @@ void Resolver::aliasSamplers(SourceLocation at, TypedExpr* target, TypedExpr* va
                                     element->operands[1]);
         }
         if (source)
-            piece->alias = source;
+            alias(piece, source);
     }
 }
 
 /// A look-up has decided what kind a sampler is.
 void Resolver::agree(TypedExpr* sampler, const Type* type) {
+    if (sampler->kind == Kind::CONDITIONAL) {
+        for (TypedExpr* one : samplersIn(sampler))
+            agree(one, type);
+        sampler->type = type;
+        return;
+    }
     Variable* root = rootVariable(sampler);
     if (!root)
         return;

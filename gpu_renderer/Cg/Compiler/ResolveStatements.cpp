@@ -4,6 +4,8 @@
 #include <Cg/Compiler/Diagnostics.h>
 
 #include <algorithm>
+#include <array>
+#include <map>
 
 namespace cg {
 
@@ -13,19 +15,6 @@ TypedStmt* make(Arena& arena, TypedStmt::Kind kind, TypedExpr* expression = null
     auto* stmt = arena.make<TypedStmt>(kind);
     stmt->expression = expression;
     return stmt;
-}
-
-bool hasEffect(const TypedExpr* expression) {
-    switch (expression->kind) {
-    case TypedExpr::Kind::CALL:
-    case TypedExpr::Kind::ASSIGN:
-    case TypedExpr::Kind::BUILTIN: // some write to their arguments
-        return true;
-    case TypedExpr::Kind::UNARY:
-        return expression->unary >= UnaryOp::PRE_INCREMENT || hasEffect(expression->operands[0]);
-    default:
-        return std::any_of(expression->operands.begin(), expression->operands.end(), hasEffect);
-    }
 }
 
 } // namespace
@@ -42,15 +31,8 @@ TypedStmt* Resolver::statement(const Stmt* stmt) {
         return declarations(static_cast<const DeclStmt*>(stmt));
     case Kind::EXPR:
         return expressionStatement(expression(static_cast<const ExprStmt*>(stmt)->expression));
-    case Kind::IF: {
-        const auto* branch = static_cast<const IfStmt*>(stmt);
-        TypedExpr* condition = expression(branch->condition);
-        condition = condition ? mBuild.condition(condition) : nullptr;
-        TypedStmt* result = make(mArena, TypedStmt::Kind::IF, condition);
-        result->body = {scoped(branch->thenBranch),
-                        branch->elseBranch ? scoped(branch->elseBranch) : nullptr};
-        return condition ? result : nullptr;
-    }
+    case Kind::IF:
+        return ifStatement(static_cast<const IfStmt*>(stmt));
     case Kind::FOR:
         return forLoop(static_cast<const ForStmt*>(stmt));
     case Kind::WHILE:
@@ -83,6 +65,41 @@ TypedStmt* Resolver::statement(const Stmt* stmt) {
         return make(mArena, TypedStmt::Kind::CONTINUE);
     }
     return nullptr;
+}
+
+/// A sampler that a branch assigns stands for a choice by the condition behind the `if`.
+TypedStmt* Resolver::ifStatement(const IfStmt* stmt) {
+    TypedExpr* condition = expression(stmt->condition);
+    condition = condition ? mBuild.condition(condition) : nullptr;
+    TypedStmt* result = make(mArena, TypedStmt::Kind::IF, condition);
+    const std::size_t start = mAliased.size();
+    std::map<Variable*, std::array<TypedExpr*, 2>> assigned;
+    const Stmt* const branches[] = {stmt->thenBranch, stmt->elseBranch};
+    for (std::size_t i = 0; i < 2; ++i) {
+        result->body.push_back(i == 0 || branches[i] ? scoped(branches[i]) : nullptr);
+        for (std::size_t one = start; one < mAliased.size(); ++one)
+            assigned[mAliased[one].variable][i] = mAliased[one].variable->alias;
+        for (; mAliased.size() > start; mAliased.pop_back())
+            mAliased.back().variable->alias = mAliased.back().before;
+    }
+    if (!condition)
+        return nullptr;
+    if (assigned.empty())
+        return result;
+    Variable* taken = makeVariable(Variable::Storage::LOCAL, "taken", condition->type, nullptr);
+    mProgram->temporaries.push_back(taken);
+    result->expression = mBuild.assign(stmt->location, mBuild.variable(stmt->location, taken), condition);
+    for (const auto& [variable, samplers] : assigned) {
+        TypedExpr* before = variable->alias || variable->storage != Variable::Storage::LOCAL
+                                ? useVariable(stmt->location, variable)
+                                : nullptr; // nothing yet: whatever the other branch gives
+        TypedExpr* whenTrue = samplers[0] ? samplers[0] : before ? before : samplers[1];
+        TypedExpr* whenFalse = samplers[1] ? samplers[1] : before ? before : samplers[0];
+        if (TypedExpr* choice = mBuild.conditional(stmt->location, mBuild.variable(stmt->location, taken),
+                                                   whenTrue, whenFalse))
+            alias(variable, choice);
+    }
+    return result;
 }
 
 TypedStmt* Resolver::block(const BlockStmt* stmt) {
@@ -154,7 +171,11 @@ void Resolver::declareLocal(const VariableDecl* declaration, std::vector<TypedSt
         if (!value)
             type = nullptr;
     } else if (type && declaration->initializer) {
-        variable->alias = expression(declaration->initializer);
+        TypedExpr* sampler = expression(declaration->initializer);
+        TypedExpr* preparation = nullptr;
+        variable->alias = sampler ? frozen(sampler, preparation) : nullptr;
+        if (preparation)
+            out.push_back(make(mArena, TypedStmt::Kind::EXPR, preparation));
     }
     const bool isSized = type && !type->isVoid() && (!type->isArray() || type->length != Type::UNSIZED);
     if (type && !isSized)

@@ -31,6 +31,8 @@ public:
     TypedProgram* resolve(const std::string& entry);
 
 private:
+    static constexpr int MAX_ARRAY_LENGTH = 65536;
+
     struct ScopeEntry {
         Name name;
         Variable* variable; ///< null for a type
@@ -72,7 +74,7 @@ private:
     const Type* findType(Name name);
     const Type* typeOf(const TypeSyntax* syntax);
     const Type* typeOf(const TypeSyntax* syntax, const std::vector<Expr*>& dimensions);
-    const Type* withDimensions(const Type* type, const std::vector<Expr*>& dimensions);
+    const Type* withDimensions(SourceLocation at, const Type* type, const std::vector<Expr*>& dimensions);
     const Type* structType(const StructDecl* declaration);
     void fillStruct(const Type* type);
     int arrayLength(const Expr* dimension);
@@ -109,6 +111,7 @@ private:
     TypedStmt* statement(const Stmt* stmt);
     TypedStmt* block(const BlockStmt* stmt);
     TypedStmt* scoped(const Stmt* stmt);
+    TypedStmt* ifStatement(const IfStmt* stmt);
     TypedStmt* declarations(const DeclStmt* stmt);
     void declareLocal(const VariableDecl* declaration, std::vector<TypedStmt*>& out);
     TypedStmt* forLoop(const ForStmt* stmt);
@@ -136,6 +139,7 @@ private:
     TypedExpr* binary(const BinaryExpr* expr);
     TypedExpr* assignment(const AssignExpr* expr);
     TypedExpr* assignElements(const AssignExpr* expr, const MemberExpr* target, TypedExpr* matrix);
+    TypedExpr* assignRow(SourceLocation at, TypedExpr* target, TypedExpr* value);
     TypedExpr* assignSampler(SourceLocation at, TypedExpr* target, TypedExpr* value);
     TypedExpr* conditional(const ConditionalExpr* expr);
     TypedExpr* stateVariable(const Expr* expr);
@@ -144,6 +148,8 @@ private:
     Variable* findVariable(Name name);
     TypedExpr* useVariable(SourceLocation at, Variable* variable);
     TypedExpr* once(TypedExpr* value, TypedExpr*& preparation);
+    TypedExpr* useName(const NameExpr* expr, Variable* variable);
+    TypedExpr* elementOfUnsized(SourceLocation at, TypedExpr* array, TypedExpr* index);
     void suggest(SourceLocation at, Name name, const std::string& what, const std::vector<Name>& known);
 
     // Calls
@@ -168,12 +174,22 @@ private:
     TypedExpr* around(TypedExpr* call, const std::vector<TypedExpr*>& before,
                       const std::vector<TypedExpr*>& after);
     TypedExpr* withKnownSampler(TypedExpr* call);
+    TypedExpr* withSimpleOperands(TypedExpr* call, std::size_t position);
+    TypedExpr* chooseCall(TypedExpr* call, std::size_t position);
+    TypedExpr* chooseCallByIndex(TypedExpr* call, std::size_t position);
+    TypedExpr* chosenSampler(SourceLocation at, const FunctionDecl* declaration,
+                             const std::vector<TypedExpr*>& arguments);
+    TypedExpr* chosenSampler(const FunctionDecl* definition, const std::vector<Stmt*>& body,
+                             std::size_t& ways);
+    bool isPlainSampler(TypedExpr* sampler) const;
 
     // Samplers
     TypedExpr* samplerMember(SourceLocation at, TypedExpr* object, Name name, const Type* type);
     Variable* samplerPiece(Variable* owner, const std::string& path, const Type* type);
     void aliasSamplers(SourceLocation at, TypedExpr* target, TypedExpr* value);
     void agree(TypedExpr* sampler, const Type* type);
+    void alias(Variable* variable, TypedExpr* sampler);
+    TypedExpr* frozen(TypedExpr* sampler, TypedExpr*& preparation);
 
     // The entry
     void resolveEntry(const FunctionDecl* declaration);
@@ -210,6 +226,14 @@ private:
     };
     std::unordered_map<const FunctionDecl*, std::vector<Instance>> mInstances;
 
+    /// A sampler variable and what it stood for before.
+    struct Aliasing {
+        Variable* variable;
+        TypedExpr* before;
+    };
+
+    std::vector<Aliasing> mAliased; ///< in their order
+    const Expr* mIndexed = nullptr; ///< what stands before the brackets that are being resolved
     Context mContext;
     int mCallDepth = 0;
     int mDefaultArguments = 0;

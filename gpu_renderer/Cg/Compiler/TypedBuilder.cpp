@@ -42,6 +42,28 @@ std::vector<int> firstComponents(int count) {
     return components;
 }
 
+bool isFullMatrix(const Type* type) {
+    return type->isMatrix() && !type->isThinMatrix();
+}
+
+/// GLSL's comparison of two vectors.
+const char* comparisonForm(BinaryOp op) {
+    switch (op) {
+    case BinaryOp::LESS:
+        return "lessThan($0, $1)";
+    case BinaryOp::LESS_EQUAL:
+        return "lessThanEqual($0, $1)";
+    case BinaryOp::GREATER:
+        return "greaterThan($0, $1)";
+    case BinaryOp::GREATER_EQUAL:
+        return "greaterThanEqual($0, $1)";
+    case BinaryOp::EQUAL:
+        return "equal($0, $1)";
+    default:
+        return "notEqual($0, $1)";
+    }
+}
+
 bool isSameSampler(Sampler a, Sampler b) {
     const auto plain = [](Sampler sampler) {
         switch (sampler) {
@@ -97,6 +119,28 @@ Variable* rootVariable(const TypedExpr* expression) {
     }
 }
 
+bool hasEffect(const TypedExpr* expression) {
+    switch (expression->kind) {
+    case Kind::CALL:
+    case Kind::ASSIGN:
+    case Kind::BUILTIN: // some write to their arguments
+        return true;
+    case Kind::UNARY:
+        return expression->unary >= UnaryOp::PRE_INCREMENT || hasEffect(expression->operands[0]);
+    default:
+        return std::any_of(expression->operands.begin(), expression->operands.end(), hasEffect);
+    }
+}
+
+std::vector<TypedExpr*> samplersIn(TypedExpr* sampler) {
+    if (sampler->kind != Kind::CONDITIONAL)
+        return {sampler};
+    std::vector<TypedExpr*> samplers = samplersIn(sampler->operands[1]);
+    for (TypedExpr* other : samplersIn(sampler->operands[2]))
+        samplers.push_back(other);
+    return samplers;
+}
+
 // ----------------------------------------------------------------------------------------- plain nodes
 
 TypedExpr* TypedBuilder::make(TypedExpr::Kind kind, SourceLocation at, const Type* type,
@@ -124,6 +168,19 @@ TypedExpr* TypedBuilder::builtin(SourceLocation at, const Type* type, Name form,
     expression->form = form;
     expression->helper = helper;
     return expression;
+}
+
+TypedExpr* TypedBuilder::byRows(SourceLocation at, const Type* type, Name form,
+                                std::vector<TypedExpr*> operands, Name helper) {
+    TypedExpr* expression = builtin(at, type, form, std::move(operands), helper);
+    expression->isByRows = true;
+    return expression;
+}
+
+TypedExpr* TypedBuilder::asksRows(SourceLocation at, const Type* type, const std::string& form,
+                                  std::vector<TypedExpr*> operands) {
+    const std::string row = "vec" + std::to_string(type->columns) + "(" + form + ")";
+    return byRows(at, type, mArena.keep(row), std::move(operands));
 }
 
 TypedExpr* TypedBuilder::field(SourceLocation at, TypedExpr* object, int index) {
@@ -483,10 +540,12 @@ bool TypedBuilder::matchShapes(SourceLocation at, TypedExpr*& left, TypedExpr*& 
 
 TypedExpr* TypedBuilder::unary(SourceLocation at, UnaryOp op, TypedExpr* operand) {
     const Type* type = operand->type;
-    if (!type->isNumeric()) {
+    if (!type->isNumeric() || (isFullMatrix(type) && op == UnaryOp::COMPLEMENT)) {
         mDiagnostics.error(at, "the operator does not take '" + nameOf(type) + "'");
         return nullptr;
     }
+    if (op == UnaryOp::NOT && isFullMatrix(type))
+        return compareMatrices(at, BinaryOp::EQUAL, operand, zero(at, type));
     if (op == UnaryOp::NOT) {
         operand = withScalar(vectorOf(operand), Scalar::BOOL);
         if (operand->type->isVector())
@@ -519,6 +578,8 @@ TypedExpr* TypedBuilder::compare(SourceLocation at, BinaryOp op, TypedExpr* left
         operandError(at, spelling(op), left, right);
         return nullptr;
     }
+    if (isFullMatrix(left->type) || isFullMatrix(right->type))
+        return compareMatrices(at, op, left, right);
     Scalar scalar = commonScalar(left, right);
     if (scalar == Scalar::BOOL && !isEquality)
         scalar = Scalar::INT;
@@ -526,30 +587,41 @@ TypedExpr* TypedBuilder::compare(SourceLocation at, BinaryOp op, TypedExpr* left
     right = withScalar(vectorOf(right), scalar);
     if (left->type->isScalar() && right->type->isScalar())
         return infix(at, op, boolean, left, right);
-    if (left->type->isMatrix() || right->type->isMatrix()) {
-        if (isEquality && left->type == right->type)
-            return infix(at, op, boolean, left, right);
-        operandError(at, spelling(op), left, right);
-        return nullptr;
-    }
     const Type* type = left->type->isVector() ? left->type : right->type;
     left = reshape(left, type);
     right = reshape(right, type);
-    const char* form = op == BinaryOp::LESS            ? "lessThan($0, $1)"
-                       : op == BinaryOp::LESS_EQUAL    ? "lessThanEqual($0, $1)"
-                       : op == BinaryOp::GREATER       ? "greaterThan($0, $1)"
-                       : op == BinaryOp::GREATER_EQUAL ? "greaterThanEqual($0, $1)"
-                       : op == BinaryOp::EQUAL         ? "equal($0, $1)"
-                                                       : "notEqual($0, $1)";
-    return builtin(at, mTypes.vector(Scalar::BOOL, type->columns), form, {left, right});
+    return builtin(at, mTypes.vector(Scalar::BOOL, type->columns), comparisonForm(op), {left, right});
+}
+
+/// By component, with 0 and 1 for the answers: matrices of bools are matrices of floats in GLSL. A scalar
+/// beside a matrix is compared with all of it.
+TypedExpr* TypedBuilder::compareMatrices(SourceLocation at, BinaryOp op, TypedExpr* left, TypedExpr* right) {
+    const Type* shape = left->type->isMatrix() ? left->type : right->type;
+    const Type* type = mTypes.matrix(Scalar::FLOAT, shape->rows, shape->columns);
+    left = reshape(withScalar(left, Scalar::FLOAT), type);
+    right = reshape(withScalar(right, Scalar::FLOAT), type);
+    return asksRows(at, type, comparisonForm(op), {left, right});
+}
+
+TypedExpr* TypedBuilder::truth(TypedExpr* matrix) {
+    return compareMatrices(matrix->location, BinaryOp::NOT_EQUAL, matrix,
+                           zero(matrix->location, matrix->type));
 }
 
 TypedExpr* TypedBuilder::logical(SourceLocation at, BinaryOp op, TypedExpr* left, TypedExpr* right) {
-    if (!left->type->isNumeric() || !right->type->isNumeric() || !matchShapes(at, left, right) ||
-        left->type->isMatrix() || right->type->isMatrix()) {
+    if (!left->type->isNumeric() || !right->type->isNumeric() || !matchShapes(at, left, right)) {
         operandError(at, spelling(op), left, right);
         return nullptr;
     }
+    if (isFullMatrix(left->type) || isFullMatrix(right->type)) {
+        const Type* shape = left->type->isMatrix() ? left->type : right->type;
+        const Type* type = mTypes.matrix(Scalar::FLOAT, shape->rows, shape->columns);
+        left = truth(reshape(withScalar(left, Scalar::FLOAT), type));
+        right = truth(reshape(withScalar(right, Scalar::FLOAT), type));
+        return byRows(at, type, op == BinaryOp::AND ? "min($0, $1)" : "max($0, $1)", {left, right});
+    }
+    left = vectorOf(left);
+    right = vectorOf(right);
     left = withScalar(left, Scalar::BOOL);
     right = withScalar(right, Scalar::BOOL);
     if (left->type->isScalar() && right->type->isScalar())
@@ -584,6 +656,10 @@ TypedExpr* TypedBuilder::binary(SourceLocation at, BinaryOp op, TypedExpr* left,
     const bool isBitOperation = op == BinaryOp::BIT_AND || op == BinaryOp::BIT_OR ||
                                 op == BinaryOp::BIT_XOR || op == BinaryOp::SHIFT_LEFT ||
                                 op == BinaryOp::SHIFT_RIGHT;
+    if (isBitOperation && (isFullMatrix(left->type) || isFullMatrix(right->type))) {
+        operandError(at, spelling(op), left, right);
+        return nullptr;
+    }
     Scalar scalar = commonScalar(left, right);
     if (scalar == Scalar::BOOL || (isBitOperation && isFloating(scalar)))
         scalar = Scalar::INT;
@@ -594,11 +670,10 @@ TypedExpr* TypedBuilder::binary(SourceLocation at, BinaryOp op, TypedExpr* left,
     if (op == BinaryOp::SHIFT_LEFT || op == BinaryOp::SHIFT_RIGHT)
         left = reshape(left, type);
     if (op == BinaryOp::MODULO && isFloating(scalar)) {
-        if (type->isMatrix() && !type->isThinMatrix()) {
-            operandError(at, spelling(op), left, right);
-            return nullptr;
-        }
-        return builtin(at, type, "cg_fmod($0, $1)", {reshape(left, type), reshape(right, type)}, "cg_fmod");
+        TypedExpr* result =
+            builtin(at, type, "cg_fmod($0, $1)", {reshape(left, type), reshape(right, type)}, "cg_fmod");
+        result->isByRows = isFullMatrix(type);
+        return result;
     }
     // GLSL leaves the remainder of a negative number open; Cg's has the sign of the dividend.
     if (op == BinaryOp::MODULO && scalar == Scalar::INT && !(constantValue(left) && constantValue(right)))
@@ -611,19 +686,30 @@ TypedExpr* TypedBuilder::binary(SourceLocation at, BinaryOp op, TypedExpr* left,
     return infix(at, op, type, left, right);
 }
 
+/// A comparison of matrices as one bool: equal ones are equal in all components, unequal ones in any.
 TypedExpr* TypedBuilder::condition(TypedExpr* expression) {
+    if (isFullMatrix(expression->type)) {
+        const bool isAny = expression->isByRows && expression->form.find("notEqual") != Name::npos;
+        return builtin(expression->location, mTypes.scalar(Scalar::BOOL), isAny ? "cg_any($0)" : "cg_all($0)",
+                       {expression}, isAny ? "cg_any" : "cg_all");
+    }
     return convert(expression, mTypes.scalar(Scalar::BOOL));
 }
 
 TypedExpr* TypedBuilder::conditional(SourceLocation at, TypedExpr* condition, TypedExpr* whenTrue,
                                      TypedExpr* whenFalse) {
+    if (whenTrue->type->isSampler() && whenFalse->type->isSampler())
+        return chooseSampler(at, condition, whenTrue, whenFalse);
     const bool areNumbers = whenTrue->type->isNumeric() && whenFalse->type->isNumeric();
     if (!condition->type->isNumeric() || (!areNumbers && whenTrue->type != whenFalse->type) ||
         (areNumbers && !matchShapes(at, whenTrue, whenFalse))) {
         operandError(at, "?:", whenTrue, whenFalse);
         return nullptr;
     }
-    condition = withScalar(vectorOf(condition), Scalar::BOOL);
+    if (areNumbers && isFullMatrix(condition->type))
+        return chooseElements(at, condition, whenTrue, whenFalse);
+    condition = isFullMatrix(condition->type) ? this->condition(condition)
+                                              : withScalar(vectorOf(condition), Scalar::BOOL);
     bool isUntyped = false;
     if (areNumbers) {
         const Scalar scalar = commonScalar(whenTrue, whenFalse);
@@ -657,6 +743,47 @@ TypedExpr* TypedBuilder::conditional(SourceLocation at, TypedExpr* condition, Ty
     if (isFloating(result->scalar))
         return builtin(at, result, "mix($0, $1, $2)", {whenFalse, whenTrue, condition});
     return builtin(at, result, "cg_select($2, $0, $1)", {whenTrue, whenFalse, condition}, "cg_select");
+}
+
+/// GLSL has no such expression: the resolver makes a choice among look-ups of it.
+TypedExpr* TypedBuilder::chooseSampler(SourceLocation at, TypedExpr* condition, TypedExpr* whenTrue,
+                                       TypedExpr* whenFalse) {
+    if (!isSameSampler(whenTrue->type->sampler, whenFalse->type->sampler) || !condition->type->isNumeric()) {
+        operandError(at, "?:", whenTrue, whenFalse);
+        return nullptr;
+    }
+    condition = this->condition(condition);
+    const Type* type = whenTrue->type->sampler == Sampler::ANY ? whenFalse->type : whenTrue->type;
+    TypedExpr* result = make(Kind::CONDITIONAL, at, type, {condition, whenTrue, whenFalse});
+    if (samplersIn(result).size() <= MAX_SAMPLER_CHOICES)
+        return result;
+    mDiagnostics.error(at, "a choice among more than " + std::to_string(MAX_SAMPLER_CHOICES) + " samplers");
+    return nullptr;
+}
+
+/// `matrix ? a : b`, the values being matrices or scalars.
+TypedExpr* TypedBuilder::chooseElements(SourceLocation at, TypedExpr* condition, TypedExpr* whenTrue,
+                                        TypedExpr* whenFalse) {
+    const auto isFitting = [](const Type* type) { return type->isScalar() || isFullMatrix(type); };
+    if (!isFitting(whenTrue->type) || !isFitting(whenFalse->type)) {
+        operandError(at, "?:", whenTrue, whenFalse);
+        return nullptr;
+    }
+    int rows = condition->type->rows;
+    int columns = condition->type->columns;
+    for (const TypedExpr* value : {whenTrue, whenFalse})
+        if (value->type->isMatrix()) {
+            rows = std::min(rows, value->type->rows);
+            columns = std::min(columns, value->type->columns);
+        }
+    Scalar scalar = commonScalar(whenTrue, whenFalse);
+    if (!isFloating(scalar))
+        scalar = Scalar::FLOAT;
+    const Type* type = mTypes.matrix(scalar, rows, columns);
+    whenTrue = reshape(withScalar(whenTrue, scalar), type);
+    whenFalse = reshape(withScalar(whenFalse, scalar), type);
+    const std::string form = "mix($2, $1, bvec" + std::to_string(columns) + "($0))";
+    return byRows(at, type, mArena.keep(form), {reshape(condition, type), whenTrue, whenFalse});
 }
 
 // -------------------------------------------------------------------------------------------- products

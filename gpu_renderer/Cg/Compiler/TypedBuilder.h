@@ -4,6 +4,7 @@
 #include <Cg/Compiler/TypedTree.h>
 
 #include <initializer_list>
+#include <string>
 #include <vector>
 
 namespace cg {
@@ -26,6 +27,11 @@ public:
     TypedExpr* variable(SourceLocation at, Variable* variable);
     TypedExpr* builtin(SourceLocation at, const Type* type, Name form, std::vector<TypedExpr*> operands,
                        Name helper = {});
+
+    /// A question with the answer 0 or 1 for each component of a matrix.
+    /// @param form  gives bools for the rows `$0`, `$1`, ...
+    TypedExpr* asksRows(SourceLocation at, const Type* type, const std::string& form,
+                        std::vector<TypedExpr*> operands);
     TypedExpr* field(SourceLocation at, TypedExpr* object, int index);
     TypedExpr* element(SourceLocation at, TypedExpr* object, TypedExpr* index);
     TypedExpr* element(SourceLocation at, TypedExpr* object, int index);
@@ -75,6 +81,14 @@ private:
     TypedExpr* compare(SourceLocation at, BinaryOp op, TypedExpr* left, TypedExpr* right);
     TypedExpr* logical(SourceLocation at, BinaryOp op, TypedExpr* left, TypedExpr* right);
     TypedExpr* infix(SourceLocation at, BinaryOp op, const Type* type, TypedExpr* left, TypedExpr* right);
+    TypedExpr* byRows(SourceLocation at, const Type* type, Name form, std::vector<TypedExpr*> operands,
+                      Name helper = {});
+    TypedExpr* truth(TypedExpr* matrix);
+    TypedExpr* compareMatrices(SourceLocation at, BinaryOp op, TypedExpr* left, TypedExpr* right);
+    TypedExpr* chooseSampler(SourceLocation at, TypedExpr* condition, TypedExpr* whenTrue,
+                             TypedExpr* whenFalse);
+    TypedExpr* chooseElements(SourceLocation at, TypedExpr* condition, TypedExpr* whenTrue,
+                              TypedExpr* whenFalse);
     TypedExpr* matrixProduct(SourceLocation at, TypedExpr* left, TypedExpr* right);
     void operandError(SourceLocation at, const char* op, const TypedExpr* left, const TypedExpr* right);
 
@@ -86,8 +100,17 @@ private:
 /// It can be written twice in the GLSL text: no side effect and nothing worth computing once.
 bool isSimple(const TypedExpr* expression);
 
+/// Its evaluation may change something.
+bool hasEffect(const TypedExpr* expression);
+
 /// The variable that an l-value is a part of, or null.
 Variable* rootVariable(const TypedExpr* expression);
+
+/// What `c ? a : b` may be, where that is a sampler; a single one else.
+std::vector<TypedExpr*> samplersIn(TypedExpr* sampler);
+
+/// Samplers that one look-up may choose among.
+constexpr std::size_t MAX_SAMPLER_CHOICES = 64;
 
 /// How an operator is written.
 const char* spelling(BinaryOp op);

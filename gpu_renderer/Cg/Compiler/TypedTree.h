@@ -32,6 +32,7 @@ struct Variable {
     const VariableDecl* declaration = nullptr; ///< null for temporaries and pieces of other variables
     Direction direction = Direction::IN;       ///< PARAMETER
     bool isConst = false;
+    bool isUnsized = false;            ///< a UNIFORM array that is as long as its elements' use asks for
     bool isWritten = false;            ///< a UNIFORM that the program writes to works on a copy
     TypedExpr* initializer = nullptr;  ///< GLOBAL, and the default value of a UNIFORM
     TypedExpr* state = nullptr;        ///< UNIFORM: the piece of OpenGL state that it stands for
@@ -77,8 +78,10 @@ struct TypedExpr {
     double number = 0;
     Variable* variable = nullptr; ///< BUILTIN: the uniform that is bound to this piece of OpenGL's state
     Function* function = nullptr;
-    Name form;   ///< BUILTIN
-    Name helper; ///< BUILTIN: name of the helper function that the form needs
+    Name form;                     ///< BUILTIN
+    Name helper;                   ///< BUILTIN: name of the helper function that the form needs
+    bool isByRows = false;         ///< BUILTIN: the form is for each row of the operands that are matrices
+    std::uint32_t outOperands = 0; ///< BUILTIN: bit i is set where operand i is written to
     int index = 0;
     std::array<std::uint8_t, 4> components{}; ///< SWIZZLE: 0 to 3, as many as the type has
     UnaryOp unary = UnaryOp::PLUS;
