@@ -296,6 +296,22 @@ TEST(Fillers, WholePicturesAreWhatTheyWereWhenFirstLookedAt) {
     }
 }
 
+/// One line of the sweep, each depth and phase, past the picture's right edge too.
+void expectSweep(uint32_t width, uint32_t columns) {
+    const Picture p = {Image::H_SWEEP, width, 1, columns, 2, 0, 0, columns, 1};
+    for (const uint32_t component : {0U, 1U})
+        for (const uint32_t bytes : {1U, 2U, 4U})
+            expectPlanarFill(p, component, bytes, 0);
+}
+
+TEST(Fillers, SweepsOfEveryWidthEqualTheWalkOverPixels) {
+    for (uint32_t width = 0; width < 600 && !HasFatalFailure(); ++width)
+        expectSweep(width, width + 40);
+    for (const uint32_t width : {720U, 1280U, 1440U, 1920U, 2048U, 3840U, 4096U, 7680U, 32768U, 40000U})
+        expectSweep(width, width);
+    expectSweep(16, 3000); // the phases leave the estimated ones in the middle of a run
+}
+
 INSTANTIATE_TEST_SUITE_P(EveryPattern, PatternFillers, testing::Range(0U, 23U));
 
 } // namespace

@@ -1,3 +1,4 @@
+#include <FwZel/SineEstimate.h>
 #include <FwZel/TestPatternCatalogue.h>
 #include <FwZel/VideoTestImage.h>
 
@@ -6,6 +7,7 @@
 #include <array>
 #include <cmath>
 #include <cstdint>
+#include <cstring>
 #include <string>
 #include <tuple>
 #include <vector>
@@ -226,6 +228,37 @@ TEST(PatternSamples, NegativeBarLevelsKeepTheirLow32Bits) {
     EXPECT_EQ(generated({Image::COLOUR_BAR_100, 80, 1, 1, 2}, 0, 0, bars), (Data{129, 129, 129, 255}));
     EXPECT_EQ(generated({Image::COLOUR_BAR_100, 80, 1, 4, 2}, 0, 0, bars),
               (Data{0x80000000, 0x80000000, 0x80000000, 0xFFFFFFFF}));
+}
+
+// The share of its bound that is the estimate's own.
+constexpr double ESTIMATE_ALONE = 3.2 / 16777216.0;
+
+TEST(SineEstimate, KeepsItsBound) {
+    double worst = 0.0;
+    float worstPhase = 0.0f;
+    const auto look = [&](float phase) {
+        const double difference = std::abs(estimatedSine(phase) - std::sin(static_cast<double>(phase)));
+        if (difference > worst) {
+            worst = difference;
+            worstPhase = phase;
+        }
+    };
+    for (float phase = 0.0f; phase <= LAST_ESTIMATED_PHASE;) {
+        look(phase);
+        uint32_t bits;
+        std::memcpy(&bits, &phase, sizeof bits);
+        bits += 307;
+        std::memcpy(&phase, &bits, sizeof phase);
+    }
+    // Where the distance from the nearest zero is smallest, and where it is largest and the sign changes.
+    for (int quarterTurns = 1; quarterTurns < 32766; ++quarterTurns) {
+        auto phase = static_cast<float>(quarterTurns * 1.57079632679489662);
+        for (int i = 0; i < 4; ++i)
+            phase = std::nextafter(phase, 0.0f);
+        for (int i = 0; i < 8; ++i, phase = std::nextafter(phase, 1e6f))
+            look(phase);
+    }
+    EXPECT_LT(worst, ESTIMATE_ALONE) << "at " << worstPhase;
 }
 
 } // namespace
