@@ -1,5 +1,7 @@
 #include <FwZel/VideoTestImage.h>
 
+#include <fixture/PatternWalk.h>
+
 #include <gtest/gtest.h>
 
 #include <sys/mman.h>
@@ -16,113 +18,6 @@ namespace {
 
 using Image = VideoTestImage;
 
-constexpr size_t GUARD = 96;
-
-struct Picture {
-    uint32_t pattern, width, height, pitch, field;
-    uint32_t posX, posY, sizeX, sizeY;
-};
-
-std::string describe(const Picture& p) {
-    const auto text = [](uint32_t number) { return std::to_string(number); };
-    return "pattern " + text(p.pattern) + ", field " + text(p.field) + ", " + text(p.width) + 'x' +
-           text(p.height) + " pitch " + text(p.pitch) + ", region " + text(p.sizeX) + 'x' + text(p.sizeY) +
-           " at " + text(p.posX) + ", " + text(p.posY);
-}
-
-/// Memory with guard bytes on both sides, of an address with any alignment.
-class GuardedBuffer {
-public:
-    GuardedBuffer(size_t bytes, size_t misalignment)
-        : mBytes(bytes + 2 * GUARD + misalignment), mStart(GUARD + misalignment) {
-        for (size_t i = 0; i < mBytes.size(); ++i)
-            mBytes[i] = static_cast<unsigned char>(i * 151 >> 3);
-    }
-    unsigned char* start() { return mBytes.data() + mStart; }
-    /// The first byte that differs, counted from the start of the picture, as text; empty when there is none.
-    std::string differenceFrom(const GuardedBuffer& other) const {
-        if (mBytes == other.mBytes)
-            return {};
-        size_t i = 0;
-        while (mBytes[i] == other.mBytes[i])
-            ++i;
-        return "byte " + std::to_string(static_cast<ptrdiff_t>(i) - static_cast<ptrdiff_t>(mStart)) + " is " +
-               std::to_string(mBytes[i]) + ", not " + std::to_string(other.mBytes[i]);
-    }
-
-private:
-    std::vector<unsigned char> mBytes;
-    size_t mStart;
-};
-
-/// Calls visit(x, y, data) for each pixel of the region, column by column.
-template <class Visit>
-void forEachPixel(const Picture& p, uint32_t bytesPerColour, Visit visit) {
-    float bars[24];
-    Image::generateColorBarData(bars, bars + 8, bars + 16, p.pattern, 1);
-    for (uint32_t x = p.posX; x < p.posX + p.sizeX; ++x)
-        for (uint32_t y = p.posY; y < p.posY + p.sizeY; ++y) {
-            uint32_t data[4];
-            Image::generatePatternData(p.pattern, p.width, p.height, x, y, bytesPerColour, p.field, data,
-                                       bars);
-            visit(x, y, data);
-        }
-}
-
-template <class Element>
-void store(unsigned char* mem, uint32_t index, uint32_t value) {
-    const auto element = static_cast<Element>(value);
-    std::memcpy(mem + size_t{index} * sizeof element, &element, sizeof element);
-}
-
-void fillSlowly(unsigned char* mem, const Picture& p, uint32_t order, bool isHalf) {
-    constexpr uint32_t COMPONENT_AT[][4] = {{3, 0, 1, 2}, {0, 1, 2, 3}, {3, 2, 1, 0}, {2, 3, 0, 1}};
-    forEachPixel(p, 1, [&](uint32_t x, uint32_t y, const uint32_t* data) {
-        for (uint32_t i = 0; i < 4; ++i) {
-            const uint32_t value = data[COMPONENT_AT[std::min(order, 3U)][i]];
-            const uint32_t index = (y * p.pitch + x) * 4 + i;
-            if (isHalf)
-                store<uint16_t>(mem, index, Image::uint8ToFp16(static_cast<uint8_t>(value)));
-            else
-                store<uint8_t>(mem, index, value);
-        }
-    });
-}
-
-void fillPlaneSlowly(unsigned char* mem, const Picture& p, uint32_t component, uint32_t bytes) {
-    forEachPixel(p, bytes, [&](uint32_t x, uint32_t y, const uint32_t* data) {
-        const uint32_t index = y * p.pitch + x;
-        if (bytes == 1)
-            store<uint8_t>(mem, index, data[component]);
-        else if (bytes == 2)
-            store<uint16_t>(mem, index, data[component]);
-        else if (bytes == 4)
-            store<uint32_t>(mem, index, data[component]);
-    });
-}
-
-void expectPackedFill(const Picture& p, uint32_t order, bool isHalf, size_t misalignment) {
-    const size_t bytes = size_t{p.pitch} * (p.posY + p.sizeY) * (isHalf ? 8 : 4);
-    GuardedBuffer expected(bytes, misalignment);
-    GuardedBuffer filled(bytes, misalignment);
-    fillSlowly(expected.start(), p, order, isHalf);
-    Image::fillTestPattern(filled.start(), order, p.width, p.height, p.pitch, p.pattern, p.field, p.posX,
-                           p.posY, p.sizeX, p.sizeY, isHalf);
-    ASSERT_EQ(filled.differenceFrom(expected), "")
-        << describe(p) << ", order " << order << (isHalf ? ", half floats" : ", bytes");
-}
-
-void expectPlanarFill(const Picture& p, uint32_t component, uint32_t bytesPerColour, size_t misalignment) {
-    const size_t bytes = size_t{p.pitch} * (p.posY + p.sizeY) * 4;
-    GuardedBuffer expected(bytes, misalignment);
-    GuardedBuffer filled(bytes, misalignment);
-    fillPlaneSlowly(expected.start(), p, component, bytesPerColour);
-    Image::fillTestPatternPlanar(filled.start(), p.width, p.height, p.pitch, p.pattern, p.field, component,
-                                 bytesPerColour, p.posX, p.posY, p.sizeX, p.sizeY);
-    ASSERT_EQ(filled.differenceFrom(expected), "")
-        << describe(p) << ", component " << component << " of " << bytesPerColour << " bytes";
-}
-
 /// Pictures and regions of any small size, the region at any place in the rows of the buffer.
 class RandomPictures {
 public:
@@ -130,8 +25,8 @@ public:
 
     uint32_t upTo(uint32_t most) { return static_cast<uint32_t>(mNumbers()) % (most + 1); }
 
-    Picture next() {
-        Picture p = {};
+    PatternRegion next() {
+        PatternRegion p = {};
         p.pattern = mPattern;
         p.width = 8 + upTo(upTo(9) == 0 ? 1200 : 150);
         p.height = 1 + upTo(upTo(9) == 0 ? 300 : 60);
@@ -154,31 +49,31 @@ class PatternFillers : public testing::TestWithParam<uint32_t> {};
 TEST_P(PatternFillers, RegionsAtOddPlacesEqualTheWalkOverPixels) {
     RandomPictures random(GetParam());
     for (int i = 0; i < 60; ++i) {
-        const Picture p = random.next();
-        expectPackedFill(p, random.upTo(4), random.upTo(1) != 0, random.upTo(15));
-        expectPlanarFill(p, random.upTo(3), std::array{1U, 2U, 4U, 3U}[random.upTo(3)], random.upTo(15));
-        if (HasFatalFailure())
-            return;
+        const PatternRegion p = random.next();
+        ASSERT_EQ(packedFillFault(p, random.upTo(4), random.upTo(1) != 0, random.upTo(15)), "");
+        ASSERT_EQ(
+            planarFillFault(p, random.upTo(3), std::array{1U, 2U, 4U, 3U}[random.upTo(3)], random.upTo(15)),
+            "");
     }
 }
 
 TEST_P(PatternFillers, WholePicturesOfEveryLayoutEqualTheWalkOverPixels) {
     for (const uint32_t field : {0U, 1U, 2U}) {
-        const Picture p = {GetParam(), 643, 301, 643, field, 0, 0, 643, 301};
+        const PatternRegion p = {GetParam(), 643, 301, 643, field, 0, 0, 643, 301};
         for (const uint32_t order : {0U, 1U, 2U, 3U}) {
-            expectPackedFill(p, order, order % 2 == 0, 0);
-            expectPlanarFill(p, order, std::array{1U, 2U, 4U}[field], 0);
+            ASSERT_EQ(packedFillFault(p, order, order % 2 == 0, 0), "");
+            ASSERT_EQ(planarFillFault(p, order, std::array{1U, 2U, 4U}[field], 0), "");
         }
     }
 }
 
 TEST_P(PatternFillers, RowsLongerThanAPieceEqualTheWalkOverPixels) {
     constexpr uint32_t LONG = 70003;
-    const Picture p = {GetParam(), LONG, 4, LONG, 2, 7, 1, LONG - 8, 3};
-    expectPackedFill(p, Image::COL_RGBA, false, 4);
-    expectPackedFill(p, Image::COL_ARGB, true, 0);
+    const PatternRegion p = {GetParam(), LONG, 4, LONG, 2, 7, 1, LONG - 8, 3};
+    ASSERT_EQ(packedFillFault(p, Image::COL_RGBA, false, 4), "");
+    ASSERT_EQ(packedFillFault(p, Image::COL_ARGB, true, 0), "");
     for (const uint32_t bytes : {1U, 2U, 4U})
-        expectPlanarFill(p, bytes / 2, bytes, 0);
+        ASSERT_EQ(planarFillFault(p, bytes / 2, bytes, 0), "");
 }
 
 /// Address space for a picture whose indices wrap, with memory at both ends only.
@@ -211,7 +106,7 @@ TEST(Fillers, IndicesWrapAt32Bits) {
     constexpr size_t INDICES = size_t{1} << 32;
     for (const uint32_t pattern : {Image::H_RAMP, Image::V_RAMP}) {
         const uint32_t pitch = (1U << 30) - 10; // line 1 starts ten pixels before the last index
-        const Picture packed = {pattern, 40, 2, pitch, 2, 0, 0, 40, 2};
+        const PatternRegion packed = {pattern, 40, 2, pitch, 2, 0, 0, 40, 2};
         for (const bool isHalf : {false, true}) {
             const WrappedBuffer expected(INDICES * (isHalf ? 2 : 1));
             const WrappedBuffer filled(INDICES * (isHalf ? 2 : 1));
@@ -220,7 +115,7 @@ TEST(Fillers, IndicesWrapAt32Bits) {
                                    isHalf);
             EXPECT_TRUE(filled == expected) << pattern << ' ' << isHalf;
         }
-        const Picture plane = {pattern, 40, 2, 0U - 10, 2, 0, 0, 40, 2};
+        const PatternRegion plane = {pattern, 40, 2, 0U - 10, 2, 0, 0, 40, 2};
         const WrappedBuffer expected(INDICES);
         const WrappedBuffer filled(INDICES);
         fillPlaneSlowly(expected.start(), plane, 0, 1);
@@ -252,13 +147,13 @@ TEST(Fillers, FlatColoursFillTheirRowsAndNothingElse) {
         for (uint32_t x = 0; x < width; ++x)
             for (uint32_t y = 0; y < height; ++y) {
                 for (uint32_t c = 0; c < 4; ++c)
-                    store<uint8_t>(expectedPacked.start(), (y * pitch + x) * 4 + c, colour[c]);
+                    storeElement<uint8_t>(expectedPacked.start(), (y * pitch + x) * 4 + c, colour[c]);
                 if (bytes == 1)
-                    store<uint8_t>(expectedPlane.start(), x + y * pitch, colour[0]);
+                    storeElement<uint8_t>(expectedPlane.start(), x + y * pitch, colour[0]);
                 else if (bytes == 2)
-                    store<uint16_t>(expectedPlane.start(), x + y * pitch, colour[0]);
+                    storeElement<uint16_t>(expectedPlane.start(), x + y * pitch, colour[0]);
                 else if (bytes == 4)
-                    store<uint32_t>(expectedPlane.start(), x + y * pitch, colour[0]);
+                    storeElement<uint32_t>(expectedPlane.start(), x + y * pitch, colour[0]);
             }
         Image::fillColour(packed.start(), width, height, pitch, colour);
         Image::fillColourPlanar(plane.start(), width, height, pitch, bytes, colour[0]);
