@@ -39,8 +39,14 @@ __attribute__((target("avx2"))) void flipWithAvx2(unsigned char* memory, uint64_
     flipWords(memory, word, words);
 }
 
-__attribute__((target("avx512f,prefer-vector-width=512"))) void flipWithAvx512(unsigned char* memory,
-                                                                               uint64_t word, size_t words) {
+// Each compiler has its own way to be told that all 512 bits are worth it.
+#if defined(__clang__)
+#define FWZEL_AVX512 __attribute__((target("avx512f"), min_vector_width(512)))
+#else
+#define FWZEL_AVX512 __attribute__((target("avx512f,prefer-vector-width=512")))
+#endif
+
+FWZEL_AVX512 void flipWithAvx512(unsigned char* memory, uint64_t word, size_t words) {
     flipWords(memory, word, words);
 }
 
