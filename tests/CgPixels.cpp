@@ -28,6 +28,7 @@
 //   //! texture NAME W H D identity      (texels (x + 0.5) / W, (y + 0.5) / H, (z + 0.5) / D, 1), nearest
 //   texel
 //   //! texture NAME W H D v...          texels of four values each, row by row
+//   //! depth NAME W H D v...            a depth texture that compares: 1 where the coordinate is at most v
 //   //! linear NAME                      the texture's filter
 //   //! coordinate N v v v v             the current texture coordinates N
 //   //! colour v v v v, //! normal v v v the current ones
@@ -58,6 +59,7 @@ struct TextureSetting {
     std::string name;
     std::array<int, 3> size;
     std::vector<float> texels;
+    bool isDepth = false; ///< one value to a texel
 };
 
 struct Case {
@@ -140,8 +142,9 @@ void readDirective(std::istream& words, Case& one) {
         words >> one.width >> one.height;
     } else if (directive == "tolerance") {
         words >> one.tolerance;
-    } else if (directive == "texture") {
+    } else if (directive == "texture" || directive == "depth") {
         readTexture(words, one);
+        one.textures.back().isDepth = directive == "depth";
     } else if (directive == "expect") {
         readExpectation(words, one);
     } else if (directive == "linear") {
@@ -278,14 +281,20 @@ GLenum targetOf(CGtype sampler) {
         return GL_TEXTURE_RECTANGLE;
     case CG_SAMPLERCUBE:
         return GL_TEXTURE_CUBE_MAP;
+    case CG_SAMPLER1DARRAY:
+        return GL_TEXTURE_1D_ARRAY;
+    case CG_SAMPLER2DARRAY:
+        return GL_TEXTURE_2D_ARRAY;
     default:
         return GL_TEXTURE_2D;
     }
 }
 
-/// A texture of single-precision texels; a cube's depth counts its faces.
+/// A texture of single-precision texels; a cube's depth counts its faces, an array's its layers.
 GLuint makeTexture(GLenum target, const TextureSetting& from, bool isLinear) {
     const auto [width, height, depth] = from.size;
+    const GLint internal = from.isDepth ? GL_DEPTH_COMPONENT32F : GL_RGBA32F;
+    const GLenum format = from.isDepth ? GL_DEPTH_COMPONENT : GL_RGBA;
     const float* const texels = from.texels.data();
     GLuint texture = 0;
     glGenTextures(1, &texture);
@@ -295,17 +304,20 @@ GLuint makeTexture(GLenum target, const TextureSetting& from, bool isLinear) {
     glTexParameteri(target, GL_TEXTURE_MAG_FILTER, filter);
     for (const GLenum wrap : {GL_TEXTURE_WRAP_S, GL_TEXTURE_WRAP_T, GL_TEXTURE_WRAP_R})
         glTexParameteri(target, wrap, GL_CLAMP_TO_EDGE);
+    if (from.isDepth)
+        glTexParameteri(target, GL_TEXTURE_COMPARE_MODE, GL_COMPARE_REF_TO_TEXTURE);
     if (target == GL_TEXTURE_1D)
-        glTexImage1D(target, 0, GL_RGBA32F, width, 0, GL_RGBA, GL_FLOAT, texels);
-    else if (target == GL_TEXTURE_3D)
-        glTexImage3D(target, 0, GL_RGBA32F, width, height, depth, 0, GL_RGBA, GL_FLOAT, texels);
+        glTexImage1D(target, 0, internal, width, 0, format, GL_FLOAT, texels);
+    else if (target == GL_TEXTURE_3D || target == GL_TEXTURE_2D_ARRAY)
+        glTexImage3D(target, 0, internal, width, height, depth, 0, format, GL_FLOAT, texels);
     else if (target == GL_TEXTURE_CUBE_MAP)
         for (int face = 0; face < 6; ++face)
-            glTexImage2D(GL_TEXTURE_CUBE_MAP_POSITIVE_X + static_cast<GLenum>(face), 0, GL_RGBA32F, width,
-                         height, 0, GL_RGBA, GL_FLOAT,
-                         texels + static_cast<ptrdiff_t>(face) * width * height * 4);
+            glTexImage2D(GL_TEXTURE_CUBE_MAP_POSITIVE_X + static_cast<GLenum>(face), 0, internal, width,
+                         height, 0, format, GL_FLOAT,
+                         texels + static_cast<ptrdiff_t>(face) * width * height * (from.isDepth ? 1 : 4));
     else
-        glTexImage2D(target, 0, GL_RGBA32F, width, height, 0, GL_RGBA, GL_FLOAT, texels);
+        glTexImage2D(target, 0, internal, width, target == GL_TEXTURE_1D_ARRAY ? depth : height, 0, format,
+                     GL_FLOAT, texels);
     glBindTexture(target, 0);
     return texture;
 }
@@ -401,7 +413,7 @@ protected:
             std::find(mCase.linear.begin(), mCase.linear.end(), setting.name) != mCase.linear.end();
         const size_t texels = static_cast<size_t>(setting.size[0]) * static_cast<size_t>(setting.size[1]) *
                               static_cast<size_t>(setting.size[2]);
-        ASSERT_EQ(setting.texels.size(), 4 * texels) << setting.name;
+        ASSERT_EQ(setting.texels.size(), (setting.isDepth ? 1 : 4) * texels) << setting.name;
         bool isFound = false;
         for (CGprogram program : mPrograms)
             if (CGparameter sampler = cgGetNamedParameter(program, setting.name.c_str())) {

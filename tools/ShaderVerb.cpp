@@ -70,7 +70,8 @@ std::string scalarName(cg::ScalarKind kind) {
 }
 
 std::string samplerName(cg::SamplerKind kind) {
-    constexpr const char* NAMES[] = {"sampler1D", "sampler2D", "sampler3D", "samplerRECT", "samplerCUBE"};
+    constexpr const char* NAMES[] = {"sampler1D",   "sampler2D",      "sampler3D",     "samplerRECT",
+                                     "samplerCUBE", "sampler1DARRAY", "sampler2DARRAY"};
     return NAMES[static_cast<size_t>(kind)];
 }
 

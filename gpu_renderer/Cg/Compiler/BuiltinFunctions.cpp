@@ -12,7 +12,7 @@ namespace {
 ///   N number, F floating, I integer, B boolean, each of the shared size; n, f, i, b the same as one scalar;
 ///   V the same as F, but never a matrix; N and F may be matrices of one shape, taken row by row;
 ///   F2, I3, ... of a fixed size; 2, 3, 4 and 1: float vectors, whatever the other operands are;
-///   M a matrix, T its transposed, Q a square one; s1 s2 s3 sR sC samplers, z1 z2 zR those of depths;
+///   M a matrix, T its transposed, Q a square one; s1 s2 s3 sR sC sA sB samplers, z those of depths;
 ///   t a text, v nothing; o before a parameter: out.
 struct Row {
     const char* name;
@@ -41,6 +41,9 @@ constexpr Row CG_ROWS[] = {
     {"mad", "F(F,F,F)", "cg_mad($0, $1, $2)", "cg_mad"},
     {"max", "N(N,N)", "max($0, $1)"},
     {"min", "N(N,N)", "min($0, $1)"},
+    {"noise", "1(1)", "cg_noise(vec3($0, 0.0, 0.0))", "cg_noise"},
+    {"noise", "1(2)", "cg_noise(vec3($0, 0.0))", "cg_noise"},
+    {"noise", "1(3)", "cg_noise($0)", "cg_noise"},
     {"modf", "F(F,oF)", "modf($0, $1)"},
     {"pow", "F(F,F)", "pow($0, $1)"},
     {"rcp", "F(F)", "cg_rcp($0)", "cg_rcp"},
@@ -123,12 +126,14 @@ constexpr Row CG_ROWS[] = {
     {"fwidth", "F(F)", "fwidth($0)"},
     {"debug", "v(4)", "cg_debug($0)", "cg_debug"},
 
-    // Look-ups, 1D. The unused third coordinate of a depth look-up stands between the others in GLSL.
+    // Look-ups, 1D. The unused third coordinate of a depth look-up stands between the others in GLSL. Where
+    // it
+    // has a look-up of the old kind, that is taken: it gives the texels of a texture that compares no depth.
     {"tex1D", "4(s1,1)", "texture($0, $1)"},
     {"tex1D", "4(s1,1,i)", "textureOffset($0, $1, $2)"},
     {"tex1D", "4(s1,1,1,1)", "textureGrad($0, $1, $2, $3)"},
     {"tex1D", "4(s1,1,1,1,i)", "textureGradOffset($0, $1, $2, $3, $4)"},
-    {"tex1D", "4(z1,2)", "cg_depth(texture($0, vec3($1.x, 0.0, $1.y)))", "cg_depth"},
+    {"tex1D", "4(z1,2)", "shadow1D($0, vec3($1.x, 0.0, $1.y))"},
     {"tex1D", "4(z1,2,1,1)", "cg_depth(textureGrad($0, vec3($1.x, 0.0, $1.y), $2, $3))", "cg_depth"},
     {"tex1Dbias", "4(s1,4)", "texture($0, $1.x, $1.w)"},
     {"tex1Dbias", "4(s1,4,i)", "textureOffset($0, $1.x, $2, $1.w)"},
@@ -137,15 +142,17 @@ constexpr Row CG_ROWS[] = {
     {"tex1Dproj", "4(s1,1)", "texture($0, $1)"},
     {"tex1Dproj", "4(s1,2)", "textureProj($0, $1)"},
     {"tex1Dproj", "4(s1,2,i)", "textureProjOffset($0, $1, $2)"},
-    {"tex1Dproj", "4(z1,3)", "cg_depth(textureProj($0, vec4($1.x, 0.0, $1.yz)))", "cg_depth"},
+    {"tex1Dproj", "4(z1,3)", "shadow1DProj($0, vec4($1.x, 0.0, $1.yz))"},
     {"tex1Dproj", "4(s1,4)", "textureProj($0, $1)"},
+    {"tex1Dcmpbias", "4(z1,4)", "cg_depth(texture($0, vec3($1.x, 0.0, $1.y), $1.w))", "cg_depth"},
+    {"tex1Dcmplod", "4(z1,4)", "cg_depth(textureLod($0, vec3($1.x, 0.0, $1.y), $1.w))", "cg_depth"},
     {"tex1Dfetch", "4(s1,I4)", "texelFetch($0, $1.x, $1.w)"},
     {"tex1Dfetch", "4(s1,I4,i)", "texelFetchOffset($0, $1.x, $1.w, $2)"},
     {"tex1Dsize", "I3(s1,i)", "ivec3(textureSize($0, $1), 0, 0)"},
 
     // 2D.
     {"tex2D", "4(s2,2)", "texture($0, $1)"},
-    {"tex2D", "4(z2,3)", "cg_depth(texture($0, $1))", "cg_depth"},
+    {"tex2D", "4(z2,3)", "shadow2D($0, $1)"},
     {"tex2D", "4(s2,2,I2)", "textureOffset($0, $1, $2)"},
     {"tex2D", "4(z2,3,I2)", "cg_depth(textureOffset($0, $1, $2))", "cg_depth"},
     {"tex2D", "4(s2,2,2,2)", "textureGrad($0, $1, $2, $3)"},
@@ -160,16 +167,18 @@ constexpr Row CG_ROWS[] = {
     {"tex2Dproj", "4(s2,2)", "texture($0, $1)"},
     {"tex2Dproj", "4(s2,3)", "textureProj($0, $1)"},
     {"tex2Dproj", "4(s2,3,I2)", "textureProjOffset($0, $1, $2)"},
-    {"tex2Dproj", "4(z2,4)", "cg_depth(textureProj($0, $1))", "cg_depth"},
+    {"tex2Dproj", "4(z2,4)", "shadow2DProj($0, $1)"},
     {"tex2Dproj", "4(s2,4)", "textureProj($0, $1)"},
     {"tex2Dproj", "4(s2,4,I2)", "textureProjOffset($0, $1, $2)"},
+    {"tex2Dcmpbias", "4(z2,4)", "cg_depth(texture($0, $1.xyz, $1.w))", "cg_depth"},
+    {"tex2Dcmplod", "4(z2,4)", "cg_depth(textureLod($0, $1.xyz, $1.w))", "cg_depth"},
     {"tex2Dfetch", "4(s2,I4)", "texelFetch($0, $1.xy, $1.w)"},
     {"tex2Dfetch", "4(s2,I4,I2)", "texelFetchOffset($0, $1.xy, $1.w, $2)"},
     {"tex2Dsize", "I3(s2,i)", "ivec3(textureSize($0, $1), 0)"},
 
     // RECT: pixel coordinates, no mip levels.
     {"texRECT", "4(sR,2)", "texture($0, $1)"},
-    {"texRECT", "4(zR,3)", "cg_depth(texture($0, $1))", "cg_depth"},
+    {"texRECT", "4(zR,3)", "shadow2DRect($0, $1)"},
     {"texRECT", "4(sR,2,I2)", "textureOffset($0, $1, $2)"},
     {"texRECT", "4(sR,2,2,2)", "textureGrad($0, $1, $2, $3)"},
     {"texRECT", "4(zR,3,2,2)", "cg_depth(textureGrad($0, $1, $2, $3))", "cg_depth"},
@@ -181,7 +190,7 @@ constexpr Row CG_ROWS[] = {
     {"texRECTproj", "4(sR,2)", "texture($0, $1)"},
     {"texRECTproj", "4(sR,3)", "textureProj($0, $1)"},
     {"texRECTproj", "4(sR,3,I2)", "textureProjOffset($0, $1, $2)"},
-    {"texRECTproj", "4(zR,4)", "cg_depth(textureProj($0, $1))", "cg_depth"},
+    {"texRECTproj", "4(zR,4)", "shadow2DRectProj($0, $1)"},
     {"texRECTproj", "4(sR,4)", "textureProj($0, $1)"},
     {"texRECTproj", "4(sR,4,I2)", "textureProjOffset($0, $1, $2)"},
     {"texRECTfetch", "4(sR,I4)", "texelFetch($0, $1.xy)"},
@@ -207,12 +216,32 @@ constexpr Row CG_ROWS[] = {
 
     // CUBE: a direction, so a projection changes nothing.
     {"texCUBE", "4(sC,3)", "texture($0, $1)"},
+    {"texCUBE", "4(zC,4)", "cg_depth(texture($0, $1))", "cg_depth"},
     {"texCUBE", "4(sC,3,3,3)", "textureGrad($0, $1, $2, $3)"},
     {"texCUBEbias", "4(sC,4)", "texture($0, $1.xyz, $1.w)"},
     {"texCUBElod", "4(sC,4)", "textureLod($0, $1.xyz, $1.w)"},
     {"texCUBEproj", "4(sC,3)", "texture($0, $1)"},
     {"texCUBEproj", "4(sC,4)", "texture($0, $1.xyz)"},
     {"texCUBEsize", "I3(sC,i)", "ivec3(textureSize($0, $1), 0)"},
+
+    // Layers of 1D and of 2D textures: the layer is the coordinate behind the last one.
+    {"tex1DARRAY", "4(sA,2)", "texture($0, $1)"},
+    {"tex1DARRAY", "4(sA,2,i)", "textureOffset($0, $1, $2)"},
+    {"tex1DARRAY", "4(sA,2,1,1)", "textureGrad($0, $1, $2, $3)"},
+    {"tex1DARRAYbias", "4(sA,4)", "texture($0, $1.xy, $1.w)"},
+    {"tex1DARRAYlod", "4(sA,4)", "textureLod($0, $1.xy, $1.w)"},
+    {"tex1DARRAYproj", "4(sA,3)", "texture($0, vec2(($1.x) / ($1.z), $1.y))"},
+    {"tex1DARRAYfetch", "4(sA,I4)", "texelFetch($0, $1.xy, $1.w)"},
+    {"tex1DARRAYsize", "I3(sA,i)", "ivec3(textureSize($0, $1), 0)"},
+    {"tex2DARRAY", "4(sB,3)", "texture($0, $1)"},
+    {"tex2DARRAY", "4(zB,4)", "cg_depth(texture($0, $1))", "cg_depth"},
+    {"tex2DARRAY", "4(sB,3,I2)", "textureOffset($0, $1, $2)"},
+    {"tex2DARRAY", "4(sB,3,2,2)", "textureGrad($0, $1, $2, $3)"},
+    {"tex2DARRAYbias", "4(sB,4)", "texture($0, $1.xyz, $1.w)"},
+    {"tex2DARRAYlod", "4(sB,4)", "textureLod($0, $1.xyz, $1.w)"},
+    {"tex2DARRAYproj", "4(sB,4)", "texture($0, vec3(($1.xy) / ($1.w), $1.z))"},
+    {"tex2DARRAYfetch", "4(sB,I4)", "texelFetch($0, $1.xyz, $1.w)"},
+    {"tex2DARRAYsize", "I3(sB,i)", "textureSize($0, $1)"},
 };
 
 /// GLSL's names, which many programs use in Cg.
@@ -258,6 +287,27 @@ constexpr Helper HELPERS[] = {
     {"cg_remainder", "T cg_remainder(T x, T y) { return x - y * (x / y); }"},
     {"cg_ldexp", "T cg_ldexp(T x, T exponent) { return x * exp2(exponent); }"},
     {"cg_log10", "T cg_log10(T x) { return log2(x) * 0.301029996; }"},
+    {"cg_lattice", "float cg_lattice(ivec3 p) {\n"
+                   "    uint h = uint(p.x) * 1664525u ^ uint(p.y) * 22695477u ^ uint(p.z) * 747796405u;\n"
+                   "    h = (h ^ (h >> 16)) * 2246822519u;\n"
+                   "    h = (h ^ (h >> 13)) * 3266489917u;\n"
+                   "    return float((h ^ (h >> 16)) >> 8) / 16777215.0;\n"
+                   "}"},
+    {"cg_noise",
+     "float cg_noise(vec3 p) {\n"
+     "    vec3 cell = floor(p);\n"
+     "    vec3 t = p - cell;\n"
+     "    t = t * t * (3.0 - 2.0 * t);\n"
+     "    ivec3 i = ivec3(cell);\n"
+     "    vec4 near = vec4(cg_lattice(i), cg_lattice(i + ivec3(1, 0, 0)), cg_lattice(i + ivec3(0, 1, 0)),\n"
+     "                     cg_lattice(i + ivec3(1, 1, 0)));\n"
+     "    vec4 far = vec4(cg_lattice(i + ivec3(0, 0, 1)), cg_lattice(i + ivec3(1, 0, 1)),\n"
+     "                    cg_lattice(i + ivec3(0, 1, 1)), cg_lattice(i + ivec3(1, 1, 1)));\n"
+     "    vec4 faces = mix(near, far, t.z);\n"
+     "    vec2 edges = mix(faces.xy, faces.zw, t.y);\n"
+     "    return mix(edges.x, edges.y, t.x);\n"
+     "}",
+     "cg_lattice"},
     {"cg_mad", "T cg_mad(T a, T b, T c) { return a * b + c; }"},
     {"cg_rcp", "T cg_rcp(T x) { return 1.0 / x; }"},
     {"cg_sincos", "void cg_sincos(T x, out T s, out T c) {\n    s = sin(x);\n    c = cos(x);\n}"},
@@ -423,8 +473,14 @@ BuiltinOperand samplerOperand(char dimension, bool isDepth) {
     case 'R':
         operand.sampler = isDepth ? Sampler::RECT_SHADOW : Sampler::RECT;
         break;
+    case 'A':
+        operand.sampler = Sampler::D1_ARRAY;
+        break;
+    case 'B':
+        operand.sampler = isDepth ? Sampler::D2_ARRAY_SHADOW : Sampler::D2_ARRAY;
+        break;
     default:
-        operand.sampler = Sampler::CUBE;
+        operand.sampler = isDepth ? Sampler::CUBE_SHADOW : Sampler::CUBE;
         break;
     }
     return operand;
@@ -501,13 +557,11 @@ BuiltinFunction read(const Row& row, bool isGlslName) {
         ++at;
         function.parameters.push_back(readOperand(at));
     }
-    const bool comparesDepth =
-        !function.parameters.empty() && (function.parameters[0].sampler == Sampler::D1_SHADOW ||
-                                         function.parameters[0].sampler == Sampler::D2_SHADOW ||
-                                         function.parameters[0].sampler == Sampler::RECT_SHADOW);
-    // A projected look-up with four coordinates and one into a 1D texture with two are mostly meant as plain
-    // ones.
-    const bool isAmbiguous = function.name.find("proj") != Name::npos || function.name == "tex1D";
+    const bool comparesDepth = !function.parameters.empty() && isDepthSampler(function.parameters[0].sampler);
+    // A projected look-up with four coordinates, one into a 1D texture with two and one with a fourth are
+    // mostly meant as plain ones.
+    const bool isAmbiguous = function.name.find("proj") != Name::npos || function.name == "tex1D" ||
+                             function.name == "texCUBE" || function.name == "tex2DARRAY";
     function.needsShadowName = comparesDepth && isAmbiguous;
     return function;
 }

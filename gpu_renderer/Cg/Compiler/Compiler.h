@@ -38,7 +38,15 @@ struct CompileRequest {
 };
 
 enum class ScalarKind { FLOAT, HALF, FIXED, INT, BOOL };
-enum class SamplerKind { SAMPLER_1D, SAMPLER_2D, SAMPLER_3D, SAMPLER_RECT, SAMPLER_CUBE };
+enum class SamplerKind {
+    SAMPLER_1D,
+    SAMPLER_2D,
+    SAMPLER_3D,
+    SAMPLER_RECT,
+    SAMPLER_CUBE,
+    SAMPLER_1D_ARRAY,
+    SAMPLER_2D_ARRAY
+};
 enum class ParameterClass { SCALAR, VECTOR, MATRIX, SAMPLER, STRUCT, ARRAY };
 enum class ParameterDirection { IN, OUT, INOUT };
 enum class ParameterVariability { UNIFORM, VARYING, CONSTANT };

@@ -250,10 +250,45 @@ bool ExpressionParser::isTypeName(std::size_t ahead) const {
         return false;
     if (name.text == "struct" || (name.text == "signed" && !mScopes.isVariableOrFunction(name.text)))
         return true;
+    if (behindTemplate(ahead) > ahead)
+        return true;
     return mScopes.isType(name.text);
 }
 
+/// @return behind `vector<float, 3>` or `matrix<float, 4, 4>`, or `ahead` where there is none
+std::size_t ExpressionParser::behindTemplate(std::size_t ahead) const {
+    const Name word = token(ahead).text;
+    if ((word != "vector" && word != "matrix") || !isAt(TokenKind::LESS, ahead + 1) ||
+        mScopes.isDeclared(word))
+        return ahead;
+    std::size_t at = ahead + 2;
+    if (!isAt(TokenKind::NAME, at++))
+        return ahead;
+    for (int sizes = word == "vector" ? 1 : 2; sizes > 0; --sizes) {
+        if (!isAt(TokenKind::COMMA, at) || !isAt(TokenKind::NUMBER, at + 1))
+            return ahead;
+        at += 2;
+    }
+    return isAt(TokenKind::GREATER, at) ? at + 1 : ahead;
+}
+
+/// `vector<float, 3>` is float3.
+TypeSyntax* ExpressionParser::parseTemplate(std::size_t behind) {
+    auto* const type = make<TypeSyntax>(token().location);
+    const std::size_t rows = 4;
+    std::string name(token(2).text);
+    name += token(rows).text;
+    if (isAt(TokenKind::COMMA, rows + 1))
+        name.append("x").append(token(rows + 2).text);
+    type->name = mArena.keep(name);
+    for (std::size_t i = 0; i < behind; ++i)
+        pass();
+    return type;
+}
+
 TypeSyntax* ExpressionParser::parseTypeName() {
+    if (const std::size_t behind = behindTemplate(0); behind > 0)
+        return parseTemplate(behind);
     takeWord("struct");
     Token name = expectName("a type");
     auto* const type = make<TypeSyntax>(name.location);
@@ -389,7 +424,7 @@ bool ExpressionParser::isAtCast() const {
     std::size_t at = isAtWord("const", 1) ? 2 : 1;
     if (!isTypeName(at))
         return false;
-    for (++at; isAt(TokenKind::NAME, at); ++at)
+    for (at = std::max(at + 1, behindTemplate(at)); isAt(TokenKind::NAME, at); ++at)
         if (!isAtWord("struct", at - 1) && !isIntegerWord(token(at).text))
             return false;
     return isAt(TokenKind::RIGHT_PAREN, behindBrackets(at));
@@ -477,7 +512,7 @@ std::vector<Expr*> ExpressionParser::parseArguments() {
 bool ExpressionParser::isAtConstructor() const {
     if (!isTypeName())
         return false;
-    std::size_t at = 1;
+    std::size_t at = std::max<std::size_t>(1, behindTemplate(0));
     while (isSizeWord(token(at - 1).text) && isAt(TokenKind::NAME, at) && isIntegerWord(token(at).text))
         ++at;
     return isAt(TokenKind::LEFT_PAREN, behindBrackets(at));

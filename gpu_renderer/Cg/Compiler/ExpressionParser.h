@@ -57,6 +57,8 @@ protected:
 
     /// `float3`, `unsigned int`, `struct Light`: without dimensions and definitions.
     TypeSyntax* parseTypeName();
+    std::size_t behindTemplate(std::size_t ahead) const;
+    TypeSyntax* parseTemplate(std::size_t behind);
 
     /// `[3]`, `[]`, none.
     std::vector<Expr*> parseDimensions();

@@ -220,9 +220,11 @@ const std::string& GlslEmitter::typeName(const Type* type) {
     if (type->isVoid()) {
         name = "void";
     } else if (type->isSampler()) {
-        constexpr const char* SAMPLERS[] = {"sampler2D",       "sampler1D",       "sampler2D",
-                                            "sampler3D",       "sampler2DRect",   "samplerCube",
-                                            "sampler1DShadow", "sampler2DShadow", "sampler2DRectShadow"};
+        constexpr const char* SAMPLERS[] = {"sampler2D",           "sampler1D",           "sampler2D",
+                                            "sampler3D",           "sampler2DRect",       "samplerCube",
+                                            "sampler1DArray",      "sampler2DArray",      "sampler1DShadow",
+                                            "sampler2DShadow",     "sampler2DRectShadow", "samplerCubeShadow",
+                                            "sampler2DArrayShadow"};
         name = SAMPLERS[static_cast<std::size_t>(type->sampler)];
     } else if (type->isMatrix() && !type->isThinMatrix()) {
         name = "mat" + std::to_string(type->rows);

@@ -44,7 +44,13 @@ SamplerKind kindOf(Sampler sampler) {
     case Sampler::RECT_SHADOW:
         return SamplerKind::SAMPLER_RECT;
     case Sampler::CUBE:
+    case Sampler::CUBE_SHADOW:
         return SamplerKind::SAMPLER_CUBE;
+    case Sampler::D1_ARRAY:
+        return SamplerKind::SAMPLER_1D_ARRAY;
+    case Sampler::D2_ARRAY:
+    case Sampler::D2_ARRAY_SHADOW:
+        return SamplerKind::SAMPLER_2D_ARRAY;
     default:
         return SamplerKind::SAMPLER_2D;
     }
@@ -145,6 +151,7 @@ private:
         parameter.parameterClass = ParameterClass::SAMPLER;
         parameter.samplerKind = kindOf(type->sampler);
         parameter.textureUnit = textureUnit(parameter.semantic);
+        parameter.variability = ParameterVariability::UNIFORM; // also within a varying struct
         if (place.memberPath.empty()) {
             parameter.glslName = place.glslName;
             return;

@@ -99,13 +99,17 @@ private:
     // ------------------------------------------------------------------------------------ declarations
 
     void parseTopLevel(std::vector<Decl*>& declarations) {
+        while (isAt(TokenKind::LEFT_BRACKET)) // `[maxvertexcount(3)]`
+            skipBracketed();
         if (take(TokenKind::SEMICOLON))
             return;
         if (isAt(TokenKind::RIGHT_BRACE))
             refuse(token().location, "'}' closes nothing here");
         if (isAtAssembly())
             refuseAssembly();
-        if (isAtEffectBlock())
+        if (isAtConstantBuffer())
+            parseConstantBuffer(declarations);
+        else if (isAtEffectBlock())
             skipEffectBlock();
         else if (isAtEffectObject())
             skipEffectObject();
@@ -113,6 +117,38 @@ private:
             parseInterface(declarations);
         else
             parseDeclaration(declarations, Place::GLOBAL);
+    }
+
+    bool isAtConstantBuffer() const {
+        if ((!isAtWord("cbuffer") && !isAtWord("tbuffer")) || mScopes.isDeclared(token().text))
+            return false;
+        const std::size_t behindName = isAt(TokenKind::NAME, 1) ? 2 : 1;
+        return isAt(TokenKind::LEFT_BRACE, behindName) || isAt(TokenKind::COLON, behindName);
+    }
+
+    /// `cbuffer Frame : register(b0) { float4 tint; };` declares what is in it, each by itself.
+    void parseConstantBuffer(std::vector<Decl*>& declarations) {
+        pass();
+        if (isAt(TokenKind::NAME))
+            pass();
+        if (isAt(TokenKind::COLON)) {
+            Semantic ignored;
+            parseSemantic(ignored);
+        }
+        const Token opening = token();
+        expect(TokenKind::LEFT_BRACE, "to begin a buffer's constants");
+        while (!isAt(TokenKind::RIGHT_BRACE)) {
+            if (isAt(TokenKind::END))
+                refuseUnclosed(opening);
+            const std::size_t start = mAt;
+            try {
+                if (!take(TokenKind::SEMICOLON))
+                    parseDeclaration(declarations, Place::GLOBAL);
+            } catch (const SyntaxError&) {
+                recover(start, Place::MEMBER);
+            }
+        }
+        pass();
     }
 
     bool isAtAssembly() const {
@@ -268,7 +304,7 @@ private:
     }
 
     bool isAtStructDefinition() const {
-        if (!isAtWord("struct"))
+        if (!isAtWord("struct") && (!isAtWord("class") || mScopes.isDeclared("class")))
             return false;
         const std::size_t behindName = isAt(TokenKind::NAME, 1) ? 2 : 1;
         return isAt(TokenKind::LEFT_BRACE, behindName) || isAt(TokenKind::COLON, behindName);
@@ -547,9 +583,10 @@ private:
     bool isAtDeclaration() const {
         if (!isAt(TokenKind::NAME))
             return false;
-        if (isAtWord("typedef") || isAtWord("struct") || isAtQualifier())
+        if (isAtWord("typedef") || isAtWord("struct") || isAtStructDefinition() || isAtQualifier())
             return true;
-        if (isAt(TokenKind::NAME, 1)) // also with an unknown type, which the resolver can name
+        // Also with an unknown type, which the resolver can name.
+        if (isAt(TokenKind::NAME, 1) || isAt(TokenKind::NAME, std::max<std::size_t>(1, behindTemplate(0))))
             return true;
         return isTypeName() && isAt(TokenKind::LEFT_BRACKET, 1) && isDeclaratorBehindBrackets();
     }

@@ -508,7 +508,7 @@ bool Resolver::hasSemantics(const Type* type) const {
 
 bool Resolver::isUniformParameter(const VariableDecl* parameter, const Type* type) {
     const Qualifiers& qualifiers = parameter->qualifiers;
-    if (qualifiers.isUniform || containsSampler(type))
+    if (qualifiers.isUniform || (containsSampler(type) && !hasSemantics(type)))
         return true;
     const bool isInput = qualifiers.direction == Direction::IN || qualifiers.direction == Direction::NONE;
     const std::string semantic = upper(parameter->semantic.name);
@@ -573,6 +573,8 @@ void Resolver::resolveEntry(const FunctionDecl* declaration) {
             mContext.scope.push_back({parameter->name, inner, nullptr});
             listed.variable = makeVariable(Variable::Storage::LOCAL, parameter->name, type, parameter);
             mProgram->arguments.push_back(listed.variable);
+            if (containsSampler(type))
+                addUniformSamplers(inner, listed.variable);
             TypedExpr* place = mBuild.variable(parameter->location, listed.variable);
             const std::string semantic = upper(parameter->semantic.name);
             if (listed.direction != Direction::OUT)
@@ -611,6 +613,8 @@ void Resolver::resolveEntry(const FunctionDecl* declaration) {
 void Resolver::addStageValues(TypedExpr* place, std::string semantic, Name name, bool isOutput) {
     const Type* type = place->type;
     const SourceLocation at = place->location;
+    if (isOpaque(type))
+        return;
     if (type->isStruct()) {
         const auto& fields = type->structure->fields;
         int offset = 0;

@@ -774,6 +774,20 @@ void Resolver::agree(TypedExpr* sampler, const Type* type) {
         part->type = part->kind == Kind::VARIABLE ? root->type : type;
 }
 
+/// The samplers among the members of an entry's parameter that is no uniform: they are uniforms nevertheless.
+/// @param outer  the variable around the entry's call
+void Resolver::addUniformSamplers(Variable* inner, Variable* outer) {
+    std::vector<std::pair<std::string, std::pair<const Type*, int>>> pieces;
+    listSamplers(inner->type, "", 1, pieces);
+    outer->storage = Variable::Storage::UNIFORM; // as its pieces are to be
+    for (const auto& [path, typeAndCount] : pieces) {
+        const auto [type, count] = typeAndCount;
+        samplerPiece(outer, path, count > 1 ? mTypes.array(type, count) : type);
+    }
+    outer->storage = Variable::Storage::LOCAL;
+    inner->samplers = outer->samplers;
+}
+
 void Resolver::addSamplerParameters(Function* function, Variable* parameter) {
     std::vector<std::pair<std::string, std::pair<const Type*, int>>> pieces;
     listSamplers(parameter->type, "", 1, pieces);

@@ -196,6 +196,7 @@ private:
     bool isUniformParameter(const VariableDecl* parameter, const Type* type);
     bool hasSemantics(const Type* type) const;
     Variable* uniformVariable(const VariableDecl* declaration, const Type* type);
+    void addUniformSamplers(Variable* inner, Variable* outer);
     void addStageValues(TypedExpr* place, std::string semantic, Name name, bool isOutput);
     void addGlobals();
 

@@ -73,6 +73,10 @@ bool isSameSampler(Sampler a, Sampler b) {
             return Sampler::D2;
         case Sampler::RECT_SHADOW:
             return Sampler::RECT;
+        case Sampler::CUBE_SHADOW:
+            return Sampler::CUBE;
+        case Sampler::D2_ARRAY_SHADOW:
+            return Sampler::D2_ARRAY;
         default:
             return sampler;
         }

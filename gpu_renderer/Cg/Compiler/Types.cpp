@@ -30,10 +30,15 @@ constexpr NamedSampler SAMPLER_NAMES[] = {{"sampler", Sampler::ANY},
                                           {"sampler3D", Sampler::D3},
                                           {"samplerRECT", Sampler::RECT},
                                           {"samplerCUBE", Sampler::CUBE},
+                                          {"sampler1DARRAY", Sampler::D1_ARRAY},
+                                          {"sampler2DARRAY", Sampler::D2_ARRAY},
                                           {"sampler2DRect", Sampler::RECT},
                                           {"samplerCube", Sampler::CUBE},
                                           {"sampler1DShadow", Sampler::D1_SHADOW},
-                                          {"sampler2DShadow", Sampler::D2_SHADOW}};
+                                          {"sampler2DShadow", Sampler::D2_SHADOW},
+                                          {"samplerCubeShadow", Sampler::CUBE_SHADOW},
+                                          {"sampler1DArray", Sampler::D1_ARRAY},
+                                          {"sampler2DArray", Sampler::D2_ARRAY}};
 
 /// GLSL's own words for what Cg calls float2 and so on.
 struct GlslVector {
@@ -160,6 +165,10 @@ const Type* TypeTable::find(Name name) const {
     for (const auto& [prefix, scalar] : GLSL_VECTORS)
         if (startsWith(name, prefix) && name.size() == prefix.size() + 1 && isSize(name.back()))
             return vector(scalar, name.back() - '0');
+    if (name == "vector")
+        return vector(Scalar::FLOAT, MAX_SIZE);
+    if (name == "matrix")
+        return matrix(Scalar::FLOAT, MAX_SIZE, MAX_SIZE);
     if (startsWith(name, "mat") && name.size() == 4 && isSize(name[3]))
         return matrix(Scalar::FLOAT, name[3] - '0', name[3] - '0');
     return nullptr;
@@ -183,8 +192,10 @@ std::string nameOf(const Type* type) {
     case Type::Kind::MATRIX:
         return nameOf(type->scalar) + std::to_string(type->rows) + "x" + std::to_string(type->columns);
     case Type::Kind::SAMPLER: {
-        constexpr const char* NAMES[] = {"sampler",     "sampler1D", "sampler2D", "sampler3D",  "samplerRECT",
-                                         "samplerCUBE", "sampler1D", "sampler2D", "samplerRECT"};
+        constexpr const char* NAMES[] = {"sampler",       "sampler1D",   "sampler2D",      "sampler3D",
+                                         "samplerRECT",   "samplerCUBE", "sampler1DARRAY", "sampler2DARRAY",
+                                         "sampler1D",     "sampler2D",   "samplerRECT",    "samplerCUBE",
+                                         "sampler2DARRAY"};
         return NAMES[static_cast<std::size_t>(type->sampler)];
     }
     case Type::Kind::STRUCT:
@@ -199,7 +210,7 @@ std::string nameOf(const Type* type) {
 }
 
 bool isDepthSampler(Sampler sampler) {
-    return sampler == Sampler::D1_SHADOW || sampler == Sampler::D2_SHADOW || sampler == Sampler::RECT_SHADOW;
+    return sampler >= Sampler::D1_SHADOW;
 }
 
 bool containsSampler(const Type* type) {

@@ -22,7 +22,21 @@ constexpr bool isFloating(Scalar scalar) {
 
 /// ANY is the bare word `sampler`, until a look-up says which; a sampler becomes a SHADOW one when a look-up
 /// compares depths.
-enum class Sampler { ANY, D1, D2, D3, RECT, CUBE, D1_SHADOW, D2_SHADOW, RECT_SHADOW };
+enum class Sampler {
+    ANY,
+    D1,
+    D2,
+    D3,
+    RECT,
+    CUBE,
+    D1_ARRAY,
+    D2_ARRAY,
+    D1_SHADOW,
+    D2_SHADOW,
+    RECT_SHADOW,
+    CUBE_SHADOW,
+    D2_ARRAY_SHADOW
+};
 
 struct StructType;
 
@@ -106,7 +120,7 @@ public:
 
 private:
     static constexpr int SCALARS = 6;
-    static constexpr int SAMPLERS = 9;
+    static constexpr int SAMPLERS = 13;
     static constexpr int MAX_SIZE = 4;
 
     Arena& mArena;

@@ -54,6 +54,10 @@ CGtype samplerType(SamplerKind kind) {
         return CG_SAMPLERRECT;
     case SamplerKind::SAMPLER_CUBE:
         return CG_SAMPLERCUBE;
+    case SamplerKind::SAMPLER_1D_ARRAY:
+        return CG_SAMPLER1DARRAY;
+    case SamplerKind::SAMPLER_2D_ARRAY:
+        return CG_SAMPLER2DARRAY;
     }
     return CG_UNKNOWN_TYPE;
 }

@@ -54,6 +54,10 @@ GLenum targetOf(SamplerKind kind) {
         return GL_TEXTURE_RECTANGLE;
     case SamplerKind::SAMPLER_CUBE:
         return GL_TEXTURE_CUBE_MAP;
+    case SamplerKind::SAMPLER_1D_ARRAY:
+        return GL_TEXTURE_1D_ARRAY;
+    case SamplerKind::SAMPLER_2D_ARRAY:
+        return GL_TEXTURE_2D_ARRAY;
     }
     return GL_TEXTURE_2D;
 }

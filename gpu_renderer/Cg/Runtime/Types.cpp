@@ -8,10 +8,16 @@ namespace {
 
 /// The types by name: each scalar kind alone, as a vector and as a matrix, and the rest.
 std::unordered_map<int, std::string> namedTypes() {
-    std::unordered_map<int, std::string> names = {
-        {CG_STRUCT, "struct"},           {CG_ARRAY, "array"},         {CG_SAMPLER1D, "sampler1D"},
-        {CG_SAMPLER2D, "sampler2D"},     {CG_SAMPLER3D, "sampler3D"}, {CG_SAMPLERRECT, "samplerRECT"},
-        {CG_SAMPLERCUBE, "samplerCUBE"}, {CG_STRING, "string"}};
+    std::unordered_map<int, std::string> names = {{CG_STRUCT, "struct"},
+                                                  {CG_ARRAY, "array"},
+                                                  {CG_SAMPLER1D, "sampler1D"},
+                                                  {CG_SAMPLER2D, "sampler2D"},
+                                                  {CG_SAMPLER3D, "sampler3D"},
+                                                  {CG_SAMPLERRECT, "samplerRECT"},
+                                                  {CG_SAMPLERCUBE, "samplerCUBE"},
+                                                  {CG_SAMPLER1DARRAY, "sampler1DARRAY"},
+                                                  {CG_SAMPLER2DARRAY, "sampler2DARRAY"},
+                                                  {CG_STRING, "string"}};
     const std::array<std::pair<int, const char*>, 5> kinds = {
         {{CG_FLOAT, "float"}, {CG_HALF, "half"}, {CG_FIXED, "fixed"}, {CG_INT, "int"}, {CG_BOOL, "bool"}}};
     for (const auto& [value, name] : kinds) {
