@@ -2,6 +2,7 @@
 #define CG_CG_H
 
 /**
+ * @file
  * The Cg runtime: contexts, programs and their parameters. cgGL.h is its OpenGL side.
  *
  * A program is compiled from Cg source to GLSL, and compiled and linked by the OpenGL driver, when it is
@@ -24,6 +25,7 @@
  * Texts that an operation returns belong to the runtime and live as long as the object that they describe.
  */
 
+/** Marks what libFwZelCg.so exports. */
 #define CG_API __attribute__((visibility("default")))
 
 #ifdef __cplusplus
@@ -39,6 +41,7 @@ typedef struct CGprogramObject* CGprogram;
 /** A parameter of a program, or an element or a member of one. */
 typedef struct CGparameterObject* CGparameter;
 
+/** CG_FALSE or CG_TRUE. */
 typedef int CGbool;
 enum { CG_FALSE = 0, CG_TRUE = 1 };
 

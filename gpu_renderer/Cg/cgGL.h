@@ -4,6 +4,7 @@
 #include <Cg/cg.h>
 
 /**
+ * @file
  * The OpenGL side of the Cg runtime: programs, parameters and textures in the OpenGL context that is current.
  *
  * A program is a separable program object. The runtime keeps one program pipeline for each OpenGL context
@@ -72,8 +73,11 @@ CG_API void cgGLBindProgram(CGprogram program);
  */
 CG_API void cgGLUnbindProgram(CGprofile profile);
 
-/* --- Values ---
- *
+/* --- Values --- */
+
+/**
+ * @file
+ * @par Values
  * A value is the program's own, whether it is bound or not, and stays until it is set again. At first it is
  * the one that the source gives, else 0. Vectors: values that the parameter has no component for are ignored,
  * and components without a value become 0. A matrix takes the values as its first row.
@@ -84,6 +88,8 @@ CG_API void cgGLUnbindProgram(CGprofile profile);
  * every value silently.
  */
 
+/** Sets a scalar or a vector. */
+/** @{ */
 CG_API void cgGLSetParameter1f(CGparameter parameter, float x);
 CG_API void cgGLSetParameter2f(CGparameter parameter, float x, float y);
 CG_API void cgGLSetParameter3f(CGparameter parameter, float x, float y, float z);
@@ -92,13 +98,16 @@ CG_API void cgGLSetParameter1fv(CGparameter parameter, const float* values);
 CG_API void cgGLSetParameter2fv(CGparameter parameter, const float* values);
 CG_API void cgGLSetParameter3fv(CGparameter parameter, const float* values);
 CG_API void cgGLSetParameter4fv(CGparameter parameter, const float* values);
+/** @} */
 
 /**
  * Sets a matrix, row by row (fr) or column by column (fc), in the size that the parameter has.
  * CG_NOT_MATRIX_PARAM_ERROR where it is not a matrix.
  */
+/** @{ */
 CG_API void cgGLSetMatrixParameterfr(CGparameter parameter, const float* values);
 CG_API void cgGLSetMatrixParameterfc(CGparameter parameter, const float* values);
+/** @} */
 
 /**
  * Sets elements of an array of scalars or vectors, each from one to four values.
@@ -108,19 +117,26 @@ CG_API void cgGLSetMatrixParameterfc(CGparameter parameter, const float* values)
  * CG_ARRAY_PARAM_ERROR where the parameter is not an array. An array of arrays counts as one array of its
  * innermost elements.
  */
+/** @{ */
 CG_API void cgGLSetParameterArray1f(CGparameter parameter, long offset, long count, const float* values);
 CG_API void cgGLSetParameterArray2f(CGparameter parameter, long offset, long count, const float* values);
 CG_API void cgGLSetParameterArray3f(CGparameter parameter, long offset, long count, const float* values);
 CG_API void cgGLSetParameterArray4f(CGparameter parameter, long offset, long count, const float* values);
+/** @} */
 
 /** The same for an array of matrices, each in the size that the elements have. */
+/** @{ */
 CG_API void cgGLSetMatrixParameterArrayfr(CGparameter parameter, long offset, long count,
                                           const float* values);
 CG_API void cgGLSetMatrixParameterArrayfc(CGparameter parameter, long offset, long count,
                                           const float* values);
+/** @} */
 
-/* --- Textures ---
- *
+/* --- Textures --- */
+
+/**
+ * @file
+ * @par Textures
  * A sampler uses the texture unit that its semantic names (TEXUNIT3), else one of its own, which no sampler
  * of any program of the other stage uses. CG_INVALID_PARAMETER_ERROR, and nothing else happens, where the
  * parameter is not a sampler. The active texture unit is what it was after each of these operations.

@@ -45,10 +45,12 @@ public:
     /// @param size  number of elements
     void addCgParam(std::string name, uint32_t type, uint32_t size);
 
-    /// The same, and then stages a value, also where the name had an entry.
-    /// @param value  as many floats as the entry has; not checked
+    /// The same, and then stages a value, also where the name had an entry. An array has as many floats as
+    /// the entry; that is not checked.
+    /// @{
     void addCgParam(std::string name, uint32_t type, uint32_t size, const float* value);
     void addCgParam(std::string name, uint32_t type, uint32_t size, float v0, float v1, float v2, float v3);
+    /// @}
 
     /// Looks the entry's parameter up in the program (cgGetNamedParameter) and stores the handle, null where
     /// the program has none of the name.
@@ -58,23 +60,25 @@ public:
     /// The same for every entry.
     void getNamedCgParameterAll();
 
-    /// Stages a value; sends nothing.
-    /// @param value  as many floats as the entry has; not checked
+    /// Stages a value; sends nothing. An array has as many floats as the entry; that is not checked.
+    /// @{
     void setCgParamValue(std::string name, const float* value);
     void setCgParamValue(std::string name, float v0, float v1, float v2, float v3);
+    /// @}
 
     /// Sends the staged value.
     void setCgParam(std::string name);
 
-    /// Stages a value and sends it.
-    /// @param value  as many floats as the entry has; not checked
+    /// Stages a value and sends it. An array has as many floats as the entry; that is not checked.
+    /// @{
     void setCgParam(std::string name, const float* value);
     void setCgParam(std::string name, float v0, float v1, float v2, float v3);
+    /// @}
 
     /// Sends the staged value of every entry.
     void setCgParamAll();
 
-    std::string getCgParamName(std::string name);
+    std::string getCgParamName(std::string name);   ///< as declared
     CGparameter getCgParamParam(std::string name);  ///< null until resolved
     uint32_t getCgParamType(std::string name);      ///< type code
     uint32_t getCgParamSize(std::string name);      ///< number of elements

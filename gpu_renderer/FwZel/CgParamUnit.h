@@ -32,13 +32,14 @@ public:
     /// @param value  getTotalSize() floats; not checked
     CgParamUnit(std::string name, uint32_t type, uint32_t size, const float* value);
 
+    /// Stores a handle; may be null.
     void setParam(CGparameter param) { mParam = param; }
 
     /// Stages a value.
     /// @param value  getTotalSize() floats; not checked
     void setValue(const float* value);
 
-    std::string getName() const { return mName; }
+    std::string getName() const { return mName; }                                  ///< as in the Cg program
     CGparameter getParam() const { return mParam; }                                ///< null until set
     uint32_t getType() const { return mType; }                                     ///< type code
     uint32_t getSize() const { return mSize; }                                     ///< number of elements

@@ -39,7 +39,7 @@ public:
 
     /// The program in which setCgResource() looks names up; may be null.
     void setCgProgram(CGprogram prog);
-    CGprogram getCGProgram() const { return mCgProgram; }
+    CGprogram getCGProgram() const { return mCgProgram; } ///< null until set
 
     /// The slot that a type code addresses, valid until the table is assigned to or destroyed. For a code
     /// that addresses none, a fresh slot apart from the table, valid until the next such code.

@@ -21,12 +21,12 @@ public:
     /// A slot of a type, without name and handle.
     explicit CgResourceUnit(uint32_t type);
 
-    void setType(uint32_t type);
-    void setName(std::string name);
-    void setParam(CGparameter param);
+    void setType(uint32_t type);      ///< resource type code
+    void setName(std::string name);   ///< name in the program
+    void setParam(CGparameter param); ///< handle of the parameter
 
-    uint32_t getType() const { return mType; }
-    std::string getName() const { return mName; }
+    uint32_t getType() const { return mType; }      ///< resource type code
+    std::string getName() const { return mName; }   ///< name in the program
     CGparameter getParam() const { return mParam; } ///< null where the program has no parameter of the name
 
     /// Does nothing.

@@ -5,6 +5,9 @@
 
 #include <string>
 
+/// @file
+/// Picture files that are refused.
+
 /// Why the picture readers refuse a file, in words for a user: a phrase without the file's name and without a
 /// full stop, such as "its colour type is grey; only RGB and RGB with alpha are read". Empty when the file is
 /// accepted. The reasons come from the readers' own checks (VideoTestImage::getWidthHeightFromFile() and

@@ -8,6 +8,7 @@
 
 class Texture;
 
+/// @file
 /// The reader of PNG files (ISO/IEC 15948), by libpng. RGB and RGB with alpha are read, 8 or 16 bits a
 /// sample, Adam7 or not; grey and palette files are refused. Samples are taken as they are: no gamma or
 /// colour profile is applied, and every ancillary chunk but tRNS is skipped.

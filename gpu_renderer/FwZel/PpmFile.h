@@ -9,6 +9,7 @@
 
 class Texture;
 
+/// @file
 /// The reader of binary PPM files ("P6"), stricter than the format: the magic, the size (width and height
 /// with one space between) and the maximum value stand on a line each, of 255 characters at most, ended by a
 /// line feed. Lines that start with "#" are comments, before any of the three. Then come the pixels, three

@@ -26,6 +26,7 @@
 /// Thread: the render thread, with the host's context current. Nothing is locked.
 class FWZEL_API Shader {
 public:
+    /// The stage of a program.
     enum ShaderType { TYPE_VERTEX = 0, TYPE_FRAGMENT = 1 };
 
     /// A vertex program from the file "Cg/vertex.cg", relative to the working directory, with the entry
@@ -49,8 +50,10 @@ public:
 
     /// Ask for the latest profile again and have its best options used. A Cg error from the first of these
     /// ends the process, see checkForCgError().
+    /// @{
     static void initVertexCgProfile();
     static void initFragmentCgProfile();
+    /// @}
 
     /// The shared context, null before the first shader is constructed.
     static CGcontext getCgContext() { return mCgContext; }
@@ -63,26 +66,34 @@ public:
     // --- Drawing
 
     /// Switch the stage of the program's profile on and off.
+    /// @{
     void enableProfile();
     void disableProfile();
+    /// @}
 
     /// Makes the program the current one of its profile.
     void bindProgram();
 
-    // --- Resource slots; see CgResource
-    //
-    // Without a table, setCgResource() and getCgResourceParam() write an unnumbered message to the log at
-    // level 3, do nothing else, and the latter returns null.
+    // --- Resource slots
+
+    /// @class Shader
+    /// @par Resource slots
+    /// Without a table, setCgResource() and getCgResourceParam() write an unnumbered message to the log at
+    /// level 3, do nothing else, and the latter returns null.
 
     /// Gives the shader a new table for its program; the shader lets go of the one that it had.
     /// @param num  number of slots; a negative one counts as 0
     void createCgResource(int num);
 
+    /// As CgResource::setCgResource().
     void setCgResource(uint32_t type, std::string name);
+    /// As CgResource::getCgResourceParam().
     CGparameter getCgResourceParam(std::string name) const;
 
-    // --- Named parameters; see CgParam
+    // --- Named parameters
 
+    /// Each is the operation of CgParam of the same name and arguments.
+    /// @{
     void addCgParam(std::string name, uint32_t type, uint32_t size);
     void addCgParam(std::string name, uint32_t type, uint32_t size, const float* value);
     void addCgParam(std::string name, uint32_t type, uint32_t size, float v0, float v1, float v2, float v3);
@@ -93,6 +104,7 @@ public:
     void setCgParam(std::string name, const float* value);
     void setCgParam(std::string name, float v0, float v1, float v2, float v3);
     void setCgParamAll();
+    /// @}
 
 private:
     void init();

@@ -7,6 +7,9 @@
 #include <cstdint>
 #include <string>
 
+/// @file
+/// The test patterns in words.
+
 /// What a person is told of one test pattern. The texts are in English, without a full stop, and live as long
 /// as the library.
 struct TestPatternEntry {
@@ -16,6 +19,7 @@ struct TestPatternEntry {
     const char* components; ///< how the four components are to be read: R', G', B', alpha or Cr, Y', Cb, key
 };
 
+/// Numbered from 0 on.
 inline constexpr uint32_t NUM_TEST_PATTERNS = 22;
 
 /// Every pattern, at the index that is its number. Any thread.

@@ -93,19 +93,23 @@ public:
     uint32_t getHeight() const { return mHeight; } ///< rows of one buffer: the field height when interlaced
     uint32_t getPitch() const { return mPitch; }   ///< bytes from one host-buffer row to the next
     uint32_t getPitchInPix() const { return mPitchInPix; } ///< pixels from one host-buffer row to the next
-    uint32_t getBytePerPix() const { return mBytePerPix; }
-    uint32_t getBytesPerPixel() const { return mNumBytesPerColour * mNumColours; }
+    uint32_t getBytePerPix() const { return mBytePerPix; } ///< components times bytes per component
+    uint32_t getBytesPerPixel() const { return mNumBytesPerColour * mNumColours; } ///< the same
+    /// What the texture was built with, see TexArgs.
+    /// @{
     uint32_t getNumColours() const { return mNumColours; }
     uint32_t getBytesPerColour() const { return mNumBytesPerColour; }
     uint32_t getNumBuffers() const { return mNumBuffers; }
     bool getIsMipMapped() const { return mIsMipMapped; }
     bool getIsPBO() const { return mIsPBO; }
     bool getIsInterlaced() const { return mIsInterlaced; }
+    /// @}
     uint32_t getColourOrder() const { return mColourOrder; } ///< a texColourOrder value, always COL_RGBA
-    uint32_t getColFormat() const { return mColFormat; }
+    uint32_t getColFormat() const { return mColFormat; }     ///< OpenGL pixel format of transfers
     /// Replaces the OpenGL pixel format of every later transfer.
     void setColFormat(uint32_t fmt) { mColFormat = fmt; }
 
+    /// OpenGL name of a buffer's texture.
     uint32_t getGLTexID(uint32_t buf_num) const { return mGLTexIDs[bufferIndex(buf_num)]; }
     /// Replaces the texture name of buffer 0 without deleting the texture that was there.
     void setGLTexID(uint32_t texId) { mGLTexIDs[0] = texId; }
@@ -157,42 +161,54 @@ public:
     void setTextureFilter(uint32_t fid);
 
     // --- Transfers
-    //
-    // One identifier: the same buffer on both sides. Two: the source first, then the destination. OpenGL
-    // moves width x height pixels under the pixel-store state of the host's context; the library sets no row
-    // length, so host buffers whose pitch differs from the width move as if their rows were width pixels
-    // long. With a pitch below the width a copy to or from a PBO ends with the host buffer; a texture upload
-    // from such a buffer would read past its end and is the caller's to avoid.
+
+    /// @class Texture
+    /// @par Transfers
+    /// One identifier: the same buffer on both sides. Two: the source first, then the destination. OpenGL
+    /// moves width x height pixels under the pixel-store state of the host's context; the library sets no row
+    /// length, so host buffers whose pitch differs from the width move as if their rows were width pixels
+    /// long. With a pitch below the width a copy to or from a PBO ends with the host buffer; a texture upload
+    /// from such a buffer would read past its end and is the caller's to avoid.
 
     /// Host buffer to texture: specifies the whole level 0 again. Leaves GL_TEXTURE_2D unbound.
+    /// @{
     void copyHostBufToGLTex(uint32_t fid);
     void copyHostBufToGLTex(uint32_t fidHostBuf, uint32_t fidGLTex);
+    /// @}
 
     /// PBO to texture, from the recorded alignment offset. The PBO must not be mapped. Leaves GL_TEXTURE_2D
     /// and GL_PIXEL_UNPACK_BUFFER unbound. Logs 456 (one identifier) or 454 (two) on a texture without PBOs,
     /// and makes no OpenGL call.
+    /// @{
     void copyPBOToGLTex(uint32_t fid);
     void copyPBOToGLTex(uint32_t fidPBO, uint32_t fidGLTex);
+    /// @}
 
     /// Host buffer to upload PBO: height x width x bytes per pixel, to the aligned address of a mapping that
     /// it makes and ends itself. A null host buffer copies nothing. Without PBOs the two-identifier form logs
     /// 455; the one-identifier form fails to map (457, 458). On a texture with readback PBOs it is refused
     /// with a message before any OpenGL call.
+    /// @{
     void copyHostBufToPBO(uint32_t fid);
     void copyHostBufToPBO(uint32_t fidHostBuf, uint32_t fidPBO);
+    /// @}
 
     /// Texture, through its FBO, to the device-side PBO and on the GPU into the PBO that the CPU maps. A
     /// texture without FBOs reads framebuffer 0. Leaves framebuffer 0 and no pixel pack or copy write buffer
     /// bound; the FBO's read buffer is colour attachment 0. Refused with a message before any OpenGL call on
     /// a texture without PBOs or with upload PBOs.
+    /// @{
     void readbackGLTexToPBO(uint32_t fid);
     void readbackGLTexToPBO(uint32_t fidGLTex, uint32_t fidPBO);
+    /// @}
 
     /// Readback PBO to host buffer: height x width x bytes per pixel from the start of a mapping that it
     /// makes and ends itself. A null host buffer copies nothing. On a texture with upload PBOs it is refused
     /// with a message before any OpenGL call; without PBOs the mapping fails (457, then 458 or 459).
+    /// @{
     void readbackPBOToHostBuf(uint32_t fid);
     void readbackPBOToHostBuf(uint32_t fidPBO, uint32_t fidHostBuf);
+    /// @}
 
     // --- PBO mapping
 

@@ -28,10 +28,13 @@ class FWZEL_API VertexList {
 public:
     /// The vertex record, in memory and in the vertex buffer: twelve floats, 48 bytes, no gaps.
     struct VertexData {
-        float posX, posY, posZ;       ///< position, byte offset 0
-        float texX, texY;             ///< texture coordinate, byte offset 12
-        float nX, nY, nZ;             ///< normal, byte offset 20
-        float colR, colG, colB, colA; ///< colour, byte offset 32
+        /// Position, at byte offset 0; texture coordinate, at 12; normal, at 20; colour, at 32.
+        /// @{
+        float posX, posY, posZ;
+        float texX, texY;
+        float nX, nY, nZ;
+        float colR, colG, colB, colA;
+        /// @}
     };
 
     /// An empty list: null arrays, buffer names 0, counts 0, line width 1.0. Makes no OpenGL call.

@@ -21,11 +21,13 @@ public:
     VertexListBox(Shader* shader, float startX, float endX, float startY, float endY);
     ~VertexListBox();
 
-    // Each stores one coordinate, to be drawn after the next updateVertexData().
+    /// Each stores one coordinate, to be drawn after the next updateVertexData().
+    /// @{
     void setStartX(float val) { mStartX = val; }
     void setEndX(float val) { mEndX = val; }
     void setStartY(float val) { mStartY = val; }
     void setEndY(float val) { mEndY = val; }
+    /// @}
 
     /// Uploads the outline if a coordinate differs from the one last uploaded, compared as floats: -0.0
     /// equals 0.0, and a NaN differs every time. Makes no OpenGL call otherwise, so it can be called every

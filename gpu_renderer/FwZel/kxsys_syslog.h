@@ -1,6 +1,9 @@
 #ifndef FWZEL_KXSYS_SYSLOG_H
 #define FWZEL_KXSYS_SYSLOG_H
 
+/// @file
+/// The log function that the host provides.
+
 /// The level of every message of the library: error, on the syslog scale of severities (RFC 5424).
 inline constexpr int KXSYS_LOG_ERROR = 3;
 
