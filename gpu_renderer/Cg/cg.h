@@ -22,6 +22,9 @@
  * Errors: the process has one error state, the last error that occurred. Success leaves it as it is; reading
  * it clears it (cgGetError(), cgGetLastErrorString()).
  *
+ * Memory: where it runs out, an operation throws std::bad_alloc and leaves programs, parameters and OpenGL as
+ * they were. A caller in C ends with it.
+ *
  * Texts that an operation returns belong to the runtime and live as long as the object that they describe.
  */
 

@@ -28,7 +28,12 @@ void Context::retire() {
 }
 
 CGprogram Context::add(std::unique_ptr<Program> program) {
-    mPrograms.push_back(std::move(program));
+    try {
+        mPrograms.push_back(std::move(program));
+    } catch (...) { // no memory; the program is still the caller's
+        program->retire();
+        throw;
+    }
     return mPrograms.back()->handle();
 }
 
@@ -55,7 +60,13 @@ Context* contextOf(CGcontext handle) {
 } // namespace cg
 
 CGcontext cgCreateContext() {
-    cg::contexts.push_back(std::make_unique<cg::Context>());
+    auto context = std::make_unique<cg::Context>();
+    try {
+        cg::contexts.push_back(std::move(context));
+    } catch (...) { // no memory; the context is still ours
+        context->retire();
+        throw;
+    }
     return cg::contexts.back()->handle();
 }
 

@@ -33,20 +33,20 @@ cg::GlslTarget cg::driver::glslTarget() {
     return target;
 }
 
-unsigned int cg::driver::linkProgram(Stage stage, const std::string& glsl, std::string& log) {
+cg::driver::LinkedProgram cg::driver::linkProgram(Stage stage, const std::string& glsl, std::string& log) {
     const char* const text = glsl.c_str();
-    const GLuint program =
-        glCreateShaderProgramv(stage == Stage::VERTEX ? GL_VERTEX_SHADER : GL_FRAGMENT_SHADER, 1, &text);
+    LinkedProgram program(
+        glCreateShaderProgramv(stage == Stage::VERTEX ? GL_VERTEX_SHADER : GL_FRAGMENT_SHADER, 1, &text));
     GLint isLinked = GL_FALSE;
-    if (program)
-        glGetProgramiv(program, GL_LINK_STATUS, &isLinked);
+    if (program.name())
+        glGetProgramiv(program.name(), GL_LINK_STATUS, &isLinked);
     if (isLinked)
         return program;
-    log = program ? infoLog(program) : "no program object\n";
-    glDeleteProgram(program);
-    return 0;
+    log = program.name() ? infoLog(program.name()) : "no program object\n";
+    return LinkedProgram(0);
 }
 
 void cg::driver::deleteProgram(unsigned int glName) {
-    glDeleteProgram(glName);
+    if (glName)
+        glDeleteProgram(glName);
 }

@@ -92,13 +92,15 @@ CGprogram compileInto(Context& context, Program::Origin origin, const char** arg
     if (!compiled.ok)
         return fail(context, CG_COMPILER_ERROR, std::move(compiled.listing));
     std::string log;
-    const unsigned int glName = driver::linkProgram(request.stage, compiled.glsl, log);
-    if (!glName)
+    driver::LinkedProgram linked = driver::linkProgram(request.stage, compiled.glsl, log);
+    if (!linked.name())
         return fail(context, CG_COMPILER_ERROR,
                     compiled.listing + origin.fileName + " : error: OpenGL does not take the GLSL of \"" +
                         origin.entry + "\":\n" + log);
     context.setListing(std::move(compiled.listing));
-    return context.add(std::make_unique<Program>(context, std::move(origin), std::move(compiled), glName));
+    auto program = std::make_unique<Program>(context, std::move(origin), std::move(compiled), linked.name());
+    linked.release();
+    return context.add(std::move(program));
 }
 
 std::string entryOrMain(const char* entry) {
@@ -108,8 +110,7 @@ std::string entryOrMain(const char* entry) {
 } // namespace
 
 Program::Program(Context& context, Origin origin, CompileResult compiled, unsigned int glName)
-    : mContext(context), mOrigin(std::move(origin)), mCompiled(std::move(compiled)),
-      mHandle(handles.add(*this)), mGlName(glName) {
+    : mContext(context), mOrigin(std::move(origin)), mCompiled(std::move(compiled)), mGlName(glName) {
     Pipeline::current().checkContext();
     mParameters.reserve(mCompiled.parameters.size());
     for (const Parameter& parameter : mCompiled.parameters)
@@ -118,7 +119,13 @@ Program::Program(Context& context, Origin origin, CompileResult compiled, unsign
     addNames(mParameters);
     findUniforms(mGlName, mParameters);
     mSamplers = assignTextureUnits(stage(), mParameters);
-    sendDefaults(mParameters);
+    try {
+        sendDefaults(mParameters);
+        mHandle = handles.add(*this);
+    } catch (...) { // no memory
+        releaseTextureUnits(stage(), mSamplers);
+        throw;
+    }
 }
 
 void Program::retire() {

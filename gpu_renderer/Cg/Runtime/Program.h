@@ -26,7 +26,8 @@ public:
         CGprofile profile;
     };
 
-    /// @param glName  the linked OpenGL program object, which the program owns until retire()
+    /// @param glName  the linked OpenGL program object, which the program owns from its construction
+    ///                until retire()
     Program(Context& context, Origin origin, CompileResult compiled, unsigned int glName);
 
     Program(const Program&) = delete;
@@ -61,7 +62,7 @@ private:
     Context& mContext;
     const Origin mOrigin;
     const CompileResult mCompiled;
-    CGprogram mHandle;
+    CGprogram mHandle = nullptr;
     const unsigned int mGlName;
     bool mIsLoaded = false;
     std::vector<ProgramParameter> mParameters;

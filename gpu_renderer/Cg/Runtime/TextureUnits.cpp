@@ -101,13 +101,14 @@ std::vector<ProgramParameter*> assignTextureUnits(Stage stage, std::vector<Progr
     const int unitCount = limit(GL_MAX_COMBINED_TEXTURE_IMAGE_UNITS);
     std::set<int> taken(namedUnits(stage == Stage::VERTEX ? Stage::FRAGMENT : Stage::VERTEX).begin(),
                         namedUnits(stage == Stage::VERTEX ? Stage::FRAGMENT : Stage::VERTEX).end());
+    Units newlyNamed;
     for (ProgramParameter* const sampler : samplers) {
         const int named = sampler->description.textureUnit;
         if (named < 0 || named >= unitCount)
             continue;
         sampler->textureUnit = named;
         taken.insert(named);
-        namedUnits(stage).insert(named);
+        newlyNamed.insert(named);
     }
     int next = stage == Stage::VERTEX ? limit(GL_MAX_TEXTURE_IMAGE_UNITS) : 0;
     for (ProgramParameter* const sampler : samplers) {
@@ -119,6 +120,7 @@ std::vector<ProgramParameter*> assignTextureUnits(Stage stage, std::vector<Progr
         if (sampler->location >= 0)
             glProgramUniform1i(sampler->program.glName(), sampler->location, sampler->textureUnit);
     }
+    namedUnits(stage).merge(newlyNamed); // last, and without allocating: all of it is done or nothing
     return samplers;
 }
 
