@@ -21,7 +21,8 @@
 /// A copy shares the program and the resource slots and has its own parameter values.
 ///
 /// Errors: those met while the shared context or a profile is set up end the process with exit status 1; a
-/// program that cannot be created is logged; no other Cg error is read.
+/// program that cannot be created is logged; no other Cg error is read. Where memory for names, values and
+/// tables runs out, an operation throws std::bad_alloc; the shader stays usable.
 ///
 /// Thread: the render thread, with the host's context current. Nothing is locked.
 class FWZEL_API Shader {

@@ -72,6 +72,7 @@ public:
     ///                     uncleared. A fill that would write past a host buffer (fewer than four components,
     ///                     a pitch shorter than the width) is not made and the buffer is cleared instead.
     /// @throw boost::thread_resource_error  the mutex cannot be created; nothing is left behind
+    /// @throw std::bad_alloc  memory is short for the tables of the buffers; nothing is left behind
     /// Logs 453 for each host buffer that cannot be allocated (2 GiB and more included); that buffer stays
     /// null.
     Texture(uint32_t testPattern, const TexArgs& args);

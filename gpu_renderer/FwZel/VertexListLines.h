@@ -12,7 +12,8 @@
 /// program that draws it must not depend on them.
 ///
 /// Owns its points and its host arrays until destruction. When memory for the arrays is short at
-/// construction, the polyline never uploads and draws nothing. Without points it draws nothing. Thread and
+/// construction, the polyline never uploads and draws nothing; short for the points, the constructor and
+/// setVertexData() throw std::bad_alloc and change nothing. Without points it draws nothing. Thread and
 /// OpenGL: see VertexList.
 class FWZEL_API VertexListLines : public VertexList {
 public:
