@@ -89,6 +89,12 @@ std::string Diagnostics::listing(const SourceFiles& files) const {
         const char* const kind = one->severity == Severity::ERROR ? "error" : "warning";
         appendHead(listing, files, one->location, kind, one->message);
         appendExcerpt(listing, files, one->location);
+        if (const SourceFiles::Expansion* expansion = files.expansionAt(one->location)) {
+            const bool isInSource = expansion->definition.line > 0;
+            appendHead(listing, files, isInSource ? expansion->definition : one->location, "note",
+                       "in the expansion of macro " + inQuotes(expansion->macro) +
+                           (isInSource ? ", which is defined here" : ""));
+        }
         for (const Diagnostic::Note& note : one->notes)
             appendHead(listing, files, note.location, "note", note.message);
     }

@@ -235,10 +235,13 @@ private:
                 putBack(paren);
                 return false;
             }
-            if (!readArguments(macro, name, arguments))
+            if (!readArguments(macro, name, arguments)) {
+                pushExpansion({numberToken("0", name.location)}, nullptr); // one error is enough
                 return true;
+            }
         }
         std::vector<Token> result = substituted(macro, name, arguments);
+        mFiles.noteExpansion(name.location, {macro.name, macro.location});
         charge(result.size() + 1);
         pushExpansion(std::move(result), &macro);
         return true;

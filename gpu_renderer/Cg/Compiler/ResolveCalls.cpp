@@ -8,6 +8,7 @@
 #include <array>
 #include <cctype>
 #include <numeric>
+#include <set>
 #include <string>
 
 namespace cg {
@@ -127,7 +128,7 @@ TypedExpr* Resolver::call(const CallExpr* expr) {
     std::vector<Name> known = builtinNames();
     for (const auto& entry : mFunctionDecls)
         known.push_back(entry.first);
-    suggest(at, name, "undeclared function", known);
+    mDiagnostics.error(at, "undeclared function " + inQuotes(name) + suggestion(name, known));
     return nullptr;
 }
 
@@ -208,6 +209,24 @@ int Resolver::argumentCost(const VariableDecl* parameter, const Type* type, cons
     return cost;
 }
 
+/// Why a function does not take the arguments.
+std::string Resolver::objection(const FunctionDecl* function, const std::vector<TypedExpr*>& arguments) {
+    const std::vector<const Type*> parameters = signatureOf(function).parameters;
+    for (std::size_t i = 0; i < std::min(arguments.size(), parameters.size()); ++i) {
+        const VariableDecl* parameter = function->parameters[i];
+        if (argumentCost(parameter, parameters[i], arguments[i]) != TypedBuilder::IMPOSSIBLE)
+            continue;
+        const std::string argument = "argument " + std::to_string(i + 1);
+        const bool isPlace = rootVariable(arguments[i]) || arguments[i]->kind == Kind::CONSTRUCT;
+        return directionOf(parameter) != Direction::IN && !isPlace
+                   ? argument + " cannot be written to"
+                   : "no conversion of " + argument + " from '" + nameOf(arguments[i]->type) + "' to '" +
+                         nameOf(parameters[i]) + "'";
+    }
+    return "it takes " + std::to_string(parameters.size()) +
+           (parameters.size() == 1 ? " argument" : " arguments");
+}
+
 /// Cg's choice: argument by argument from the left, only the functions that take it at the least cost stay.
 /// @param report  an error where there is none, with all that there would be
 const FunctionDecl* Resolver::choose(SourceLocation at, Name name,
@@ -244,7 +263,8 @@ const FunctionDecl* Resolver::choose(SourceLocation at, Name name,
                            "no matching function " + inQuotes(name) + " for (" + listTypes(arguments) + ")");
         for (const FunctionDecl* function : functions)
             if (signatureOf(function).result)
-                mDiagnostics.note(function->location, "candidate: " + describe(function));
+                mDiagnostics.note(function->location,
+                                  "candidate: " + describe(function) + ": " + objection(function, arguments));
     }
     return nullptr;
 }
@@ -744,6 +764,29 @@ const Type* typeFor(const Operand& operand, const Binding& binding, const TypeTa
     return nullptr;
 }
 
+/// An operand as a programmer writes it; `floatN` is a vector of the size that all such ones share.
+std::string describeOperand(const Operand& operand, const TypeTable& types) {
+    const std::string size = operand.size == Operand::SHARED ? "N"
+                             : operand.size == 1             ? ""
+                                                             : std::to_string(operand.size);
+    const std::string direction = operand.isOut ? "out " : "";
+    switch (operand.kind) {
+    case Operand::Kind::NUMBER:
+    case Operand::Kind::FLOATING:
+        return direction + "float" + size;
+    case Operand::Kind::INTEGER:
+        return direction + "int" + size;
+    case Operand::Kind::BOOLEAN:
+        return direction + "bool" + size;
+    case Operand::Kind::SAMPLER:
+        return nameOf(types.sampler(operand.sampler));
+    case Operand::Kind::TEXT:
+        return "string";
+    default:
+        return "matrix";
+    }
+}
+
 /// Takes matrices for generic operands: of the smallest shape, and only where the function works by
 /// component.
 bool bindMatrices(const BuiltinFunction& function, const std::vector<TypedExpr*>& arguments,
@@ -863,6 +906,25 @@ std::string Resolver::withKnownOffset(const BuiltinFunction& function, std::vect
     return form.erase(word, std::string("Offset").size());
 }
 
+void Resolver::refuseBuiltin(SourceLocation at, Name name, const std::vector<BuiltinFunction>& functions,
+                             const std::vector<TypedExpr*>& arguments) {
+    mDiagnostics.error(at, "no matching function " + inQuotes(name) + " for (" + listTypes(arguments) + ")");
+    std::set<std::string> described; // those of depth samplers look the same
+    const auto hasCount = [&arguments](const BuiltinFunction& function) {
+        return function.parameters.size() == arguments.size();
+    };
+    const bool isCountKnown = std::any_of(functions.begin(), functions.end(), hasCount);
+    for (const BuiltinFunction& function : functions) {
+        if (isCountKnown && !hasCount(function))
+            continue;
+        std::string text;
+        for (const Operand& operand : function.parameters)
+            text += (text.empty() ? "" : ", ") + describeOperand(operand, mTypes);
+        if (described.insert(text).second)
+            mDiagnostics.note(at, "candidate: " + std::string(name) + "(" + text + ")");
+    }
+}
+
 /// @param report          an error where the name is known but takes no such arguments
 /// @param withGlslNames   also GLSL's own names
 /// @param isKnown         receives whether there is such a built-in function
@@ -913,8 +975,7 @@ TypedExpr* Resolver::callBuiltin(SourceLocation at, Name name, const std::vector
     }
     if (!best) {
         if (report)
-            mDiagnostics.error(at, "no matching function " + inQuotes(name) + " for (" +
-                                       listTypes(arguments) + ")");
+            refuseBuiltin(at, name, *lookup.functions, arguments);
         return nullptr;
     }
 

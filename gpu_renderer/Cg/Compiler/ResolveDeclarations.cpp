@@ -112,7 +112,13 @@ const Type* Resolver::typeOf(const TypeSyntax* syntax) {
         type = findType(syntax->name);
     }
     if (!type) {
-        mDiagnostics.error(syntax->location, "unknown type " + inQuotes(syntax->name));
+        std::vector<Name> known = builtinTypeNames();
+        for (const auto& entry : mStructDecls)
+            known.push_back(entry.first);
+        for (const auto& entry : mTypedefs)
+            known.push_back(entry.first);
+        mDiagnostics.error(syntax->location,
+                           "unknown type " + inQuotes(syntax->name) + suggestion(syntax->name, known));
         return nullptr;
     }
     return withDimensions(syntax->location, type, syntax->dimensions);
@@ -490,9 +496,17 @@ TypedProgram* Resolver::resolve(const std::string& entry) {
     if (declaration)
         resolveEntry(declaration);
     else
-        mDiagnostics.error({}, "the program has no function " + inQuotes(entry) + " to start with");
+        refuseEntry(entry);
     addGlobals();
     return mProgram;
+}
+
+void Resolver::refuseEntry(const std::string& entry) {
+    std::vector<Name> known;
+    for (const auto& function : mFunctionDecls)
+        known.push_back(function.first);
+    mDiagnostics.error({}, "the program has no function " + inQuotes(entry) + " to start with" +
+                               suggestion(entry, known));
 }
 
 bool Resolver::hasSemantics(const Type* type) const {

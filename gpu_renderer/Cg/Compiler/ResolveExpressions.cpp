@@ -219,28 +219,26 @@ TypedExpr* Resolver::name(const NameExpr* expr) {
             known.push_back(entry.name);
     for (const auto& entry : mGlobalDecls)
         known.push_back(entry.first);
-    suggest(expr->location, expr->name, "undeclared name", known);
+    mDiagnostics.error(expr->location,
+                       "undeclared name " + inQuotes(expr->name) + suggestion(expr->name, known));
     return nullptr;
 }
 
-void Resolver::suggest(SourceLocation at, Name name, const std::string& what,
-                       const std::vector<Name>& known) {
-    std::string message = what + " " + inQuotes(name);
+/// "; did you mean 'length'?", or nothing.
+std::string Resolver::suggestion(Name name, const std::vector<Name>& known) {
+    if (name.size() < 2 || name.size() > MAX_SUGGESTED_NAME)
+        return {};
     const std::size_t limit = name.size() < 4 ? 1 : 2;
     Name best;
     std::size_t bestDistance = limit + 1;
     for (const Name candidate : known) {
-        if (name.size() > MAX_SUGGESTED_NAME)
-            break;
         const std::size_t distance = editDistance(name, candidate, limit);
         if (distance < bestDistance || (distance == bestDistance && distance <= limit && candidate < best)) {
             bestDistance = distance;
             best = candidate;
         }
     }
-    if (bestDistance <= limit && name.size() > 1)
-        message += "; did you mean " + inQuotes(best) + "?";
-    mDiagnostics.error(at, message);
+    return bestDistance <= limit ? "; did you mean " + inQuotes(best) + "?" : std::string();
 }
 
 TypedExpr* Resolver::nothing(SourceLocation at) {
@@ -274,7 +272,8 @@ TypedExpr* Resolver::memberOf(SourceLocation at, TypedExpr* object, Name name) {
             std::vector<Name> known;
             for (const Field& field : type->structure->fields)
                 known.push_back(field.name);
-            suggest(at, name, "'" + nameOf(type) + "' has no member", known);
+            mDiagnostics.error(at, "'" + nameOf(type) + "' has no member " + inQuotes(name) +
+                                       suggestion(name, known));
             return nullptr;
         }
         const Type* memberType = type->structure->fields[static_cast<std::size_t>(index)].type;

@@ -150,7 +150,7 @@ private:
     TypedExpr* once(TypedExpr* value, TypedExpr*& preparation);
     TypedExpr* useName(const NameExpr* expr, Variable* variable);
     TypedExpr* elementOfUnsized(SourceLocation at, TypedExpr* array, TypedExpr* index);
-    void suggest(SourceLocation at, Name name, const std::string& what, const std::vector<Name>& known);
+    static std::string suggestion(Name name, const std::vector<Name>& known);
 
     // Calls
     TypedExpr* call(const CallExpr* expr);
@@ -161,6 +161,7 @@ private:
     const FunctionDecl* choose(SourceLocation at, Name name,
                                const std::vector<const FunctionDecl*>& candidates,
                                const std::vector<TypedExpr*>& arguments, bool report);
+    std::string objection(const FunctionDecl* function, const std::vector<TypedExpr*>& arguments);
     int argumentCost(const VariableDecl* parameter, const Type* type, const TypedExpr* argument);
     TypedExpr* defaultArgument(SourceLocation at, const FunctionDecl* declaration, std::size_t index,
                                const Type* type);
@@ -168,6 +169,8 @@ private:
                             std::vector<TypedExpr*> arguments, TypedExpr* self);
     TypedExpr* callBuiltin(SourceLocation at, Name name, const std::vector<TypedExpr*>& arguments,
                            bool report, bool withGlslNames, bool& isKnown);
+    void refuseBuiltin(SourceLocation at, Name name, const std::vector<BuiltinFunction>& functions,
+                       const std::vector<TypedExpr*>& arguments);
     std::string withKnownOffset(const BuiltinFunction& function, std::vector<TypedExpr*>& arguments);
     TypedExpr* passArgument(TypedExpr* argument, const Type* type, Direction direction,
                             std::vector<TypedExpr*>& before, std::vector<TypedExpr*>& after);
@@ -192,6 +195,7 @@ private:
     TypedExpr* frozen(TypedExpr* sampler, TypedExpr*& preparation);
 
     // The entry
+    void refuseEntry(const std::string& entry);
     void resolveEntry(const FunctionDecl* declaration);
     bool isUniformParameter(const VariableDecl* parameter, const Type* type);
     bool hasSemantics(const Type* type) const;

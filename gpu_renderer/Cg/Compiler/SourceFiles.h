@@ -6,6 +6,7 @@
 
 #include <cstdint>
 #include <deque>
+#include <map>
 #include <optional>
 #include <string>
 #include <string_view>
@@ -52,6 +53,23 @@ public:
     };
     Shown shown(SourceLocation location) const;
 
+    /// What stands at a location comes out of a macro whose name is written there.
+    struct Expansion {
+        std::string_view macro;
+        SourceLocation definition; ///< in no line for a macro that the host defines
+    };
+
+    /// Of macros within macros the outermost counts, which is noted first.
+    void noteExpansion(SourceLocation location, const Expansion& expansion) {
+        mExpansions.emplace(location, expansion);
+    }
+
+    /// Null where no macro was expanded.
+    const Expansion* expansionAt(SourceLocation location) const {
+        const auto found = mExpansions.find(location);
+        return found == mExpansions.end() ? nullptr : &found->second;
+    }
+
 private:
     struct Renumbering {
         std::uint32_t line;
@@ -66,6 +84,7 @@ private:
 
     std::deque<File> mFiles; ///< a deque: texts stay where they are
     std::unordered_map<std::string_view, std::uint32_t> mIndexByName;
+    std::map<SourceLocation, Expansion> mExpansions;
     Arena mSpellings;
 };
 

@@ -174,6 +174,18 @@ const Type* TypeTable::find(Name name) const {
     return nullptr;
 }
 
+std::vector<Name> builtinTypeNames() {
+    std::vector<Name> names = {"float2",   "float3",  "float4", "float2x2", "float3x3", "float3x4",
+                               "float4x4", "half2",   "half3",  "half4",    "fixed2",   "fixed3",
+                               "fixed4",   "int2",    "int3",   "int4",     "bool2",    "bool3",
+                               "bool4",    "half4x4", "void",   "string"};
+    for (const NamedScalar& known : SCALAR_NAMES)
+        names.push_back(known.name);
+    for (const NamedSampler& known : SAMPLER_NAMES)
+        names.push_back(known.name);
+    return names;
+}
+
 const char* nameOf(Scalar scalar) {
     constexpr const char* NAMES[] = {"bool", "int", "uint", "fixed", "half", "float"};
     return NAMES[static_cast<std::size_t>(scalar)];

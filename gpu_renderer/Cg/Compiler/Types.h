@@ -133,6 +133,9 @@ private:
     std::vector<const Type*> mStructs;
 };
 
+/// The most common names of built-in types, for "did you mean".
+std::vector<Name> builtinTypeNames();
+
 /// @return the type as a programmer writes it: `float3x4`, `Light[2]`
 std::string nameOf(const Type* type);
 
