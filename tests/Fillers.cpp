@@ -193,10 +193,10 @@ TEST(Fillers, WholePicturesAreWhatTheyWereWhenFirstLookedAt) {
 
 /// One line of the sweep, each depth and phase, past the picture's right edge too.
 void expectSweep(uint32_t width, uint32_t columns) {
-    const Picture p = {Image::H_SWEEP, width, 1, columns, 2, 0, 0, columns, 1};
+    const PatternRegion p = {Image::H_SWEEP, width, 1, columns, 2, 0, 0, columns, 1};
     for (const uint32_t component : {0U, 1U})
         for (const uint32_t bytes : {1U, 2U, 4U})
-            expectPlanarFill(p, component, bytes, 0);
+            ASSERT_EQ(planarFillFault(p, component, bytes, 0), "");
 }
 
 TEST(Fillers, SweepsOfEveryWidthEqualTheWalkOverPixels) {

@@ -120,7 +120,7 @@ TEST_F(PpmFiles, EveryComponentFormAndFieldIsAsDefined) {
 // Pieces of the file end within rows and within pixels, at places that the length of the header moves.
 TEST_F(PpmFiles, PicturesOfManyPiecesComeWhole) {
     const TemporaryFile file("picture.ppm");
-    for (const size_t commentLength : {0, 1, 2, 100}) {
+    for (const size_t commentLength : {size_t{0}, size_t{1}, size_t{2}, size_t{100}}) {
         const std::string comment = commentLength == 0 ? "" : "#" + std::string(commentLength, 'x') + "\n";
         for (const PpmPicture& picture : {PpmPicture{1021, 260, comment}, PpmPicture{50001, 7, comment},
                                           PpmPicture{50001, 7, comment, 400000}}) {
