@@ -1,5 +1,7 @@
 #include <FwZel/WordLoops.h>
 
+#include <cstring>
+
 namespace {
 
 constexpr size_t WORD = sizeof(uint64_t);

@@ -3,21 +3,16 @@
 
 #include <cstddef>
 #include <cstdint>
-#include <cstring>
+#include <limits>
 
 // Private to the library: loops over memory in words of 64 bits, on the widest registers that the machine
 // has.
 
 /// A pixel as often as it goes into a word.
 template <class Pixel>
-uint64_t repeatedInWord(Pixel pixel) {
-    static_assert(sizeof(uint64_t) % sizeof pixel == 0);
-    unsigned char bytes[sizeof(uint64_t)];
-    for (size_t offset = 0; offset < sizeof bytes; offset += sizeof pixel)
-        std::memcpy(bytes + offset, &pixel, sizeof pixel);
-    uint64_t word;
-    std::memcpy(&word, bytes, sizeof word);
-    return word;
+constexpr uint64_t repeatedInWord(Pixel pixel) {
+    constexpr uint64_t ONE_IN_EACH = ~uint64_t{0} / std::numeric_limits<Pixel>::max();
+    return pixel * ONE_IN_EACH;
 }
 
 /// Stores a word over and over, the last time as many of its first bytes as there is room for.
