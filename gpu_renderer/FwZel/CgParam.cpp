@@ -9,7 +9,7 @@
 namespace {
 
 /// Stages four floats, or as many of them as the entry has.
-void stage(CgParamUnit& unit, const std::array<float, 4>& values) {
+void stageFour(CgParamUnit& unit, const std::array<float, 4>& values) {
     std::copy_n(values.begin(), std::min<size_t>(values.size(), unit.getTotalSize()), unit.getValue());
 }
 
@@ -31,7 +31,7 @@ void CgParam::addCgParam(std::string name, uint32_t type, uint32_t size, const f
 
 void CgParam::addCgParam(std::string name, uint32_t type, uint32_t size, float v0, float v1, float v2,
                          float v3) {
-    stage(declare(std::move(name), type, size), {v0, v1, v2, v3});
+    stageFour(declare(std::move(name), type, size), {v0, v1, v2, v3});
 }
 
 CGparameter CgParam::getNamedCgParameter(std::string name) {
@@ -45,13 +45,11 @@ void CgParam::getNamedCgParameterAll() {
 }
 
 void CgParam::setCgParamValue(std::string name, const float* value) {
-    if (CgParamUnit* const unit = find(name))
-        unit->setValue(value);
+    stage(name, value);
 }
 
 void CgParam::setCgParamValue(std::string name, float v0, float v1, float v2, float v3) {
-    if (CgParamUnit* const unit = find(name))
-        stage(*unit, {v0, v1, v2, v3});
+    stage(name, v0, v1, v2, v3);
 }
 
 void CgParam::setCgParam(std::string name) {
@@ -68,7 +66,7 @@ void CgParam::setCgParam(std::string name, const float* value) {
 
 void CgParam::setCgParam(std::string name, float v0, float v1, float v2, float v3) {
     if (CgParamUnit* const unit = find(name)) {
-        stage(*unit, {v0, v1, v2, v3});
+        stageFour(*unit, {v0, v1, v2, v3});
         send(*unit);
     }
 }
@@ -109,6 +107,16 @@ float* CgParam::getCgParamValue(std::string name) {
 }
 
 void CgParam::printCgParams() {}
+
+void CgParam::stage(const std::string& name, const float* value) {
+    if (CgParamUnit* const unit = find(name))
+        unit->setValue(value);
+}
+
+void CgParam::stage(const std::string& name, float v0, float v1, float v2, float v3) {
+    if (CgParamUnit* const unit = find(name))
+        stageFour(*unit, {v0, v1, v2, v3});
+}
 
 CgParamUnit* CgParam::find(const std::string& name) {
     const auto entry = mCgParams.find(name);

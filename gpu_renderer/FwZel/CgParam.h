@@ -89,6 +89,10 @@ public:
     void printCgParams();
 
 private:
+    friend class Shader; // hands its calls on by reference: the name is a copy already
+
+    void stage(const std::string& name, const float* value);
+    void stage(const std::string& name, float v0, float v1, float v2, float v3);
     CgParamUnit* find(const std::string& name);
     CgParamUnit& declare(std::string name, uint32_t type, uint32_t size);
     CGparameter resolve(CgParamUnit& unit);

@@ -180,11 +180,11 @@ void Shader::getNamedCgParameterAll() {
 }
 
 void Shader::setCgParamValue(std::string name, const float* value) {
-    mCgParam.setCgParamValue(std::move(name), value);
+    mCgParam.stage(name, value);
 }
 
 void Shader::setCgParamValue(std::string name, float v0, float v1, float v2, float v3) {
-    mCgParam.setCgParamValue(std::move(name), v0, v1, v2, v3);
+    mCgParam.stage(name, v0, v1, v2, v3);
 }
 
 void Shader::setCgParam(std::string name) {
