@@ -7,6 +7,8 @@
 //
 // The size is the program's: lines of Cg, or 1 where it does not matter. bench/compare knows the targets.
 
+#include "BenchmarkRow.h"
+
 #include <Cg/Compiler/Compiler.h>
 #include <Cg/cgGL.h>
 #include <HeadlessContext.h>
@@ -17,24 +19,19 @@
 
 #include <algorithm>
 #include <array>
-#include <cstdio>
 #include <cstdlib>
 #include <fstream>
-#include <functional>
 #include <iterator>
+#include <stdexcept>
 #include <string>
+#include <utility>
 
 namespace {
-
-[[noreturn]] void stop(const std::string& reason) {
-    std::fprintf(stderr, "bench-cg-translate: %s\n", reason.c_str());
-    std::exit(1);
-}
 
 std::string textOf(const char* file) {
     std::ifstream in(file);
     if (!in)
-        stop(std::string("cannot read ") + file);
+        throw std::runtime_error(std::string("cannot read ") + file);
     return {std::istreambuf_iterator<char>(in), {}};
 }
 
@@ -61,7 +58,7 @@ GLuint link(const std::string& vertex, const std::string& fragment) {
     GLint isLinked = GL_FALSE;
     glGetProgramiv(program, GL_LINK_STATUS, &isLinked);
     if (!isLinked)
-        stop("OpenGL does not link a pair");
+        throw std::runtime_error("OpenGL does not link a pair");
     return program;
 }
 
@@ -92,48 +89,28 @@ CGprogram makeProgram(CGcontext context, CGprofile profile, const char* entry) {
         "float4 show(uniform float4 value) : COLOR { return value; }\n";
     CGprogram program = cgCreateProgram(context, CG_SOURCE, SOURCE, profile, entry, nullptr);
     if (!program)
-        stop(cgGetLastListing(context));
+        throw std::runtime_error(cgGetLastListing(context));
     cgGLLoadProgram(program);
     return program;
-}
-
-using Work = std::function<void()>;
-
-/// A row. The work is done once before it is timed: a driver finishes its compilation at the first draw.
-void add(
-    const std::string& row, const Work& work, const Work& prepare = [] {}) {
-    benchmark::RegisterBenchmark(row.c_str(), [=](benchmark::State& state) {
-        prepare();
-        work();
-        work();
-        for (auto _ : state)
-            work();
-    })->Unit(benchmark::kMicrosecond);
-}
-
-void addLimit(
-    const std::string& group, const Work& work, const Work& prepare = [] {}) {
-    add(group + "limit", work, prepare);
-    add(group + "limit-again", work, prepare);
 }
 
 void addTranslation(const char* file) {
     const std::string source = textOf(file);
     const cg::CompileResult result = translate(source);
     if (!result.ok)
-        stop(result.listing);
+        throw std::runtime_error(result.listing);
     const auto lines = std::count(source.begin(), source.end(), '\n');
-    const std::string group = "cg-translate/" + std::to_string(lines) + '/';
-    addLimit(group, [glsl = result.glsl] {
+    const std::string group = "cg-translate/" + std::to_string(lines);
+    addLimit(group, 0, [glsl = result.glsl] {
         const char* const text = glsl.c_str();
         const GLuint program = glCreateShaderProgramv(GL_FRAGMENT_SHADER, 1, &text);
         GLint isLinked = GL_FALSE;
         glGetProgramiv(program, GL_LINK_STATUS, &isLinked);
         if (!isLinked)
-            stop("OpenGL does not take the GLSL");
+            throw std::runtime_error("OpenGL does not take the GLSL");
         glDeleteProgram(program);
     });
-    add(group + "translate", [source] { benchmark::DoNotOptimize(translate(source)); });
+    addRow(group + "/translate", 0, [source] { benchmark::DoNotOptimize(translate(source)); });
 }
 
 void addSwitching() {
@@ -142,7 +119,7 @@ void addSwitching() {
     const std::string fragment = "#version 330 compatibility\nuniform vec4 value2;\n"
                                  "void main() { gl_FragColor = value2; }\n";
     const std::array<GLuint, 2> pairs = {link(vertex, fragment), link(vertex, fragment)};
-    addLimit("cg-switch/1/", [pairs, which = size_t{0}]() mutable {
+    addLimit("cg-switch/1", 0, [pairs, which = size_t{0}]() mutable {
         which = 1 - which;
         glUseProgram(pairs[which]);
         draw();
@@ -157,16 +134,16 @@ void addSwitching() {
         cgGLEnableProfile(CG_PROFILE_GLSLF);
         cgGLBindProgram(place);
     };
-    add(
-        "cg-switch/1/switch",
+    addRow(
+        "cg-switch/1/switch", 0,
         [shows, which = size_t{0}]() mutable {
             which = 1 - which;
             cgGLBindProgram(shows[which]);
             draw();
         },
         enable);
-    add(
-        "cg-switch/1/switch-and-enable",
+    addRow(
+        "cg-switch/1/switch-and-enable", 0,
         [shows, which = size_t{0}]() mutable {
             which = 1 - which;
             cgGLEnableProfile(CG_PROFILE_GLSLF);
@@ -183,23 +160,20 @@ void addSetting() {
                              "void main() { gl_FragColor = value; }\n";
     const GLuint program = glCreateShaderProgramv(GL_FRAGMENT_SHADER, 1, &text);
     const GLint location = glGetUniformLocation(program, "value");
-    addLimit("cg-set/1/", [=] { glProgramUniform4fv(program, location, 1, VALUES.data()); });
+    addLimit("cg-set/1", 0, [=] { glProgramUniform4fv(program, location, 1, VALUES.data()); });
     CGprogram show = makeProgram(cgCreateContext(), CG_PROFILE_GLSLF, "show");
     CGparameter value = cgGetNamedParameter(show, "value");
-    add("cg-set/1/set", [=] { cgGLSetParameter4fv(value, VALUES.data()); });
+    addRow("cg-set/1/set", 0, [=] { cgGLSetParameter4fv(value, VALUES.data()); });
 }
 
 } // namespace
 
-int main(int argc, char** argv) {
+void addRows() {
     // A driver that finds a program in its cache compiles nothing.
     setenv("MESA_SHADER_CACHE_DISABLE", "true", 1);
-    const host::HeadlessContext context;
+    static const host::HeadlessContext context;
     makeTarget();
     addTranslation(FWZEL_CG_PROGRAM);
     addSwitching();
     addSetting();
-    benchmark::Initialize(&argc, argv);
-    benchmark::RunSpecifiedBenchmarks();
-    return 0;
 }

@@ -12,8 +12,6 @@
 
 #include <HeadlessContext.h>
 
-#include <benchmark/benchmark.h>
-
 #include <fcntl.h>
 #include <png.h>
 #include <unistd.h>
@@ -28,21 +26,17 @@
 #include <algorithm>
 #include <array>
 #include <cstdio>
-#include <cstdlib>
 #include <cstring>
-#include <iostream>
+#include <functional>
 #include <memory>
 #include <stdexcept>
+#include <string>
+#include <utility>
 #include <vector>
 
 namespace {
 
 constexpr size_t PIECE_BYTES = size_t{128} * 1024;
-
-[[noreturn]] void fail(const std::string& what) {
-    std::cerr << "bench-readers: " << what << '\n';
-    std::exit(1);
-}
 
 /// Where a limit writes.
 struct Rows {
@@ -177,84 +171,79 @@ void readPngBare(const std::string& path, const Rows& to, bool isHalf) {
 
 // --- The pictures and the textures that take them
 
-/// The pictures of one size and the textures that take them.
+/// The pictures of one size and a texture that takes them.
 struct Subject {
-    Subject(uint32_t width, uint32_t height)
-        : pictures(width, height), bytes(VideoTestImage::NO_TEST_PATTERN, argsOf(width, height, false)),
-          halves(VideoTestImage::NO_TEST_PATTERN, argsOf(width, height, true)) {}
+    Subject(uint32_t width, uint32_t height, bool isHalf)
+        : pictures(width, height), texture(VideoTestImage::NO_TEST_PATTERN, argsOf(width, height, isHalf)) {}
 
-    static Texture::TexArgs argsOf(uint32_t width, uint32_t height, bool isFp16) {
+    static Texture::TexArgs argsOf(uint32_t width, uint32_t height, bool isHalf) {
         Texture::TexArgs args;
         Texture::setDefaultValue(args);
         args.width = args.pitchInPix = width;
         args.height = height;
-        args.isFp16 = isFp16;
+        args.isFp16 = isHalf;
         return args;
     }
 
-    static Rows rowsOf(Texture& texture) {
+    Rows rows() {
         return {texture.getAddress(0), texture.getWidth(), texture.getHeight(), texture.getPitch()};
     }
 
     CameraPictures pictures;
-    Texture bytes, halves;
+    Texture texture;
 };
 
-/// The reader beside its limit. A limit that writes other bytes is none, so both are compared first.
-void addReader(const std::string& group, Texture& texture, const Work& limit, const Work& reader) {
-    const size_t bytes = size_t{texture.getPitch()} * texture.getHeight();
-    unsigned char* const buffer = texture.getAddress(0);
+using Reading = std::function<void(Subject&)>;
+
+/// A limit that writes other bytes than the reader is none.
+void requireSameBytes(const std::string& group, Subject& subject, const Reading& limit,
+                      const Reading& reader) {
+    const size_t bytes = size_t{subject.texture.getPitch()} * subject.texture.getHeight();
+    unsigned char* const buffer = subject.texture.getAddress(0);
     std::memset(buffer, 1, bytes);
-    limit();
+    limit(subject);
     const std::vector<unsigned char> expected(buffer, buffer + bytes);
     std::memset(buffer, 2, bytes);
-    reader();
+    reader(subject);
     if (std::memcmp(buffer, expected.data(), bytes) != 0)
-        fail(group + ": the reader and its limit differ");
-    addRow(group + "/limit", bytes, limit);
-    addRow(group + "/limit-again", bytes, limit);
-    addRow(group + "/reader", bytes, reader);
+        throw std::runtime_error(group + ": the reader and its limit differ");
 }
 
-std::string rowGroup(const std::string& format, bool isHalf, const std::string& size) {
-    return format + (isHalf ? "-half/" : "-8bit/") + size;
-}
-
-void addReaders(Subject& subject) {
-    std::string size = std::to_string(subject.bytes.getWidth());
-    size.append("x").append(std::to_string(subject.bytes.getHeight()));
-    for (const bool isHalf : {false, true}) {
-        Texture* const texture = isHalf ? &subject.halves : &subject.bytes;
-        const Rows rows = Subject::rowsOf(*texture);
-        addReader(
-            rowGroup("ppm", isHalf, size), *texture,
-            [=, path = subject.pictures.ppm()] {
-                readPpmBare(path, rows, isHalf ? rgbToHalfRgba : rgbToRgba, isHalf ? 8 : 4);
-            },
-            [=, path = subject.pictures.ppm()] { fillTextureFromPpmFile(path, texture, 0, 2, 0, isHalf); });
-        addReader(
-            rowGroup("png", isHalf, size), *texture,
-            [=, path = subject.pictures.png()] { readPngBare(path, rows, isHalf); },
-            [=, path = subject.pictures.png()] { fillTextureFromPngFile(path, texture, 0, 2, 0, isHalf); });
-    }
+/// The reader beside its limit.
+void addReader(const std::string& format, uint32_t width, uint32_t height, bool isHalf, const Reading& limit,
+               const Reading& reader) {
+    const std::string group =
+        format + (isHalf ? "-half/" : "-8bit/") + std::to_string(width) + 'x' + std::to_string(height);
+    const size_t bytes = size_t{width} * height * (isHalf ? 8 : 4);
+    const Shared<Subject> subject([=] {
+        auto made = std::make_unique<Subject>(width, height, isHalf);
+        requireSameBytes(group, *made, limit, reader);
+        return made;
+    });
+    addLimit(group, bytes, [=] { limit(*subject); });
+    addRow(group + "/reader", bytes, [=] { reader(*subject); });
 }
 
 } // namespace
 
-int main(int argc, char** argv) {
-    benchmark::Initialize(&argc, argv);
-    if (benchmark::ReportUnrecognizedArguments(argc, argv))
-        return 2;
-    try {
-        const host::HeadlessContext context;
-        Subject hd(1920, 1080);
-        Subject uhd(3840, 2160);
-        addReaders(hd);
-        addReaders(uhd);
-        benchmark::RunSpecifiedBenchmarks();
-    } catch (const std::runtime_error& error) {
-        fail(error.what());
-    }
-    benchmark::Shutdown();
-    return 0;
+void addRows() {
+    static const host::HeadlessContext context;
+    for (const auto& [width, height] : {std::pair(1920U, 1080U), std::pair(3840U, 2160U)})
+        for (const bool isHalf : {false, true}) {
+            addReader(
+                "ppm", width, height, isHalf,
+                [=](Subject& to) {
+                    readPpmBare(to.pictures.ppm(), to.rows(), isHalf ? rgbToHalfRgba : rgbToRgba,
+                                isHalf ? 8 : 4);
+                },
+                [=](Subject& to) {
+                    fillTextureFromPpmFile(to.pictures.ppm(), &to.texture, 0, 2, 0, isHalf);
+                });
+            addReader(
+                "png", width, height, isHalf,
+                [=](Subject& to) { readPngBare(to.pictures.png(), to.rows(), isHalf); },
+                [=](Subject& to) {
+                    fillTextureFromPngFile(to.pictures.png(), &to.texture, 0, 2, 0, isHalf);
+                });
+        }
 }

@@ -15,6 +15,7 @@
 #include <cstdlib>
 #include <cstring>
 #include <memory>
+#include <string>
 #include <vector>
 
 namespace {
@@ -48,11 +49,10 @@ Texture::TexArgs argsOf(const Size& size, const Format& format) {
 
 void addCompared(const std::string& group, const Size& size, const Format& format, const Work& limit,
                  const Work& ours) {
-    const std::string prefix = group + '-' + format.name + '/' + size.name + '/';
+    const std::string prefix = group + '-' + format.name + '/' + size.name;
     const size_t bytes = size_t{size.width} * size.height * format.bytesPerPixel;
-    addRow(prefix + "limit", bytes, limit);
-    addRow(prefix + "limit-again", bytes, limit);
-    addRow(prefix + "ours", bytes, ours);
+    addLimit(prefix, bytes, limit);
+    addRow(prefix + "/ours", bytes, ours);
 }
 
 void setParameters() {
@@ -89,22 +89,26 @@ void addConstruction(const Size& size, const Format& format) {
 
 /// The same fresh buffer, filled by the reader alone.
 void addFileConstruction(const Size& size, const Format& format) {
-    const auto pictures = std::make_shared<CameraPictures>(size.width, size.height);
-    for (const std::string& path : {pictures->png(), pictures->ppm()})
+    const Shared<CameraPictures> pictures(
+        [=] { return std::make_unique<CameraPictures>(size.width, size.height); });
+    const auto add = [&](const char* group, std::string (CameraPictures::*path)() const) {
         addCompared(
-            "construction-" + path.substr(path.size() - 3), size, format,
+            group, size, format,
             [=] {
                 Texture texture(VideoTestImage::NO_TEST_PATTERN, argsOf(size, format));
-                VideoTestImage::fillTextureFile(path, &texture, 0, 2, 0, format.isHalf);
+                VideoTestImage::fillTextureFile(((*pictures).*path)(), &texture, 0, 2, 0, format.isHalf);
             },
-            // The pictures stay as long as the row.
-            [=, kept = pictures] { const Texture texture(path, argsOf(size, format)); });
+            [=] { const Texture texture(((*pictures).*path)(), argsOf(size, format)); });
+    };
+    add("construction-png", &CameraPictures::png);
+    add("construction-ppm", &CameraPictures::ppm);
 }
 
 void addUploads(const Size& size, const Format& format) {
     Texture::TexArgs args = argsOf(size, format);
     args.isPBO = true;
-    const auto texture = std::make_shared<Texture>(VideoTestImage::COLOUR_BAR_75, args);
+    const Shared<Texture> texture(
+        [=] { return std::make_unique<Texture>(VideoTestImage::COLOUR_BAR_75, args); });
     const size_t bytes = size_t{size.width} * size.height * format.bytesPerPixel;
     const auto width = static_cast<GLsizei>(size.width);
     const auto height = static_cast<GLsizei>(size.height);
@@ -139,27 +143,37 @@ void addUploads(const Size& size, const Format& format) {
         [=] { texture->copyPBOToGLTex(0); });
 }
 
+/// A texture with content, and a buffer for its pixels on the device.
+class ReadTexture : public Texture {
+public:
+    explicit ReadTexture(const TexArgs& args) : Texture(VideoTestImage::COLOUR_BAR_75, args) {
+        copyHostBufToGLTex(0);
+        glGenBuffers(1, &mOnDevice); // lives as long as the context
+        glBindBuffer(GL_PIXEL_PACK_BUFFER, mOnDevice);
+        glBufferData(GL_PIXEL_PACK_BUFFER, GLsizeiptr{getPitch()} * getHeight(), nullptr, GL_STATIC_COPY);
+        glBindBuffer(GL_PIXEL_PACK_BUFFER, 0);
+    }
+    GLuint onDevice() const { return mOnDevice; }
+
+private:
+    GLuint mOnDevice = 0;
+};
+
 void addReadback(const Size& size, const Format& format) {
     Texture::TexArgs args = argsOf(size, format);
     args.isPBO = args.isFBO = true;
     args.pboAccessType = GL_READ_ONLY;
-    const auto texture = std::make_shared<Texture>(VideoTestImage::COLOUR_BAR_75, args);
-    texture->copyHostBufToGLTex(0);
+    const Shared<ReadTexture> texture([=] { return std::make_unique<ReadTexture>(args); });
     const size_t bytes = size_t{size.width} * size.height * format.bytesPerPixel;
     const auto width = static_cast<GLsizei>(size.width);
     const auto height = static_cast<GLsizei>(size.height);
-    GLuint onDevice = 0;
-    glGenBuffers(1, &onDevice); // lives as long as the context
-    glBindBuffer(GL_PIXEL_PACK_BUFFER, onDevice);
-    glBufferData(GL_PIXEL_PACK_BUFFER, static_cast<GLsizeiptr>(bytes), nullptr, GL_STATIC_COPY);
-    glBindBuffer(GL_PIXEL_PACK_BUFFER, 0);
 
     addCompared(
         "transfer-texture-to-pbo", size, format,
         [=] {
             glBindFramebufferEXT(GL_FRAMEBUFFER_EXT, texture->getFboID(0));
             glReadBuffer(GL_COLOR_ATTACHMENT0_EXT);
-            glBindBuffer(GL_PIXEL_PACK_BUFFER, onDevice);
+            glBindBuffer(GL_PIXEL_PACK_BUFFER, texture->onDevice());
             glReadPixels(0, 0, width, height, GL_RGBA, format.type, nullptr);
             glBindBuffer(GL_COPY_WRITE_BUFFER, texture->getPboID(0));
             glCopyBufferSubData(GL_PIXEL_PACK_BUFFER, GL_COPY_WRITE_BUFFER, 0, 0,
@@ -182,15 +196,12 @@ void addReadback(const Size& size, const Format& format) {
 
 } // namespace
 
-int main(int argc, char** argv) {
-    benchmark::Initialize(&argc, argv);
-    if (benchmark::ReportUnrecognizedArguments(argc, argv))
-        return 2;
+void addRows() {
     // Both sides of a construction get fresh pages: glibc would raise the threshold after the first large
     // buffer.
     constexpr int ONE_MIB = 1 << 20;
     mallopt(M_MMAP_THRESHOLD, ONE_MIB);
-    const host::HeadlessContext context;
+    static const host::HeadlessContext context;
     for (const Size& size : SIZES)
         for (const Format& format : FORMATS) {
             addConstruction(size, format);
@@ -198,8 +209,4 @@ int main(int argc, char** argv) {
             addUploads(size, format);
             addReadback(size, format);
         }
-    benchmark::RunSpecifiedBenchmarks();
-    benchmark::ClearRegisteredBenchmarks(); // with them go the textures, while there is a context
-    benchmark::Shutdown();
-    return 0;
 }
