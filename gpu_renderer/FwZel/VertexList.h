@@ -53,9 +53,10 @@ public:
     /// Makes no OpenGL call at all where there is nothing valid to draw: a buffer name is 0, or
     /// mHasNothingToDraw is set. A list of 0 indices is drawn like any other, to no effect.
     ///
-    /// Leaves the four client arrays disabled and both buffer bindings 0. After GL_TRIANGLE_STRIP and
-    /// GL_POLYGON primitive restart stays enabled with index 0xFFFFFFFF; after GL_LINE_STRIP the line width
-    /// stays.
+    /// Leaves the four client arrays disabled, with other pointers, and both buffer bindings 0; the current
+    /// colour, normal and texture coordinate are undefined, as OpenGL has it of drawing from arrays. After
+    /// GL_TRIANGLE_STRIP and GL_POLYGON primitive restart stays enabled with index 0xFFFFFFFF; after
+    /// GL_LINE_STRIP the line width stays.
     void render();
 
 protected:
