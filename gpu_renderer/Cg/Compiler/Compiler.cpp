@@ -9,6 +9,8 @@
 #include <Cg/Compiler/References.h>
 #include <Cg/Compiler/Resolver.h>
 #include <Cg/Compiler/SourceFiles.h>
+#include <Cg/Compiler/StageInterface.h>
+#include <Cg/Compiler/VaryingPlaces.h>
 
 #include <cstddef>
 #include <set>
@@ -31,6 +33,19 @@ PreprocessorOptions preprocessorOptions(const CompileRequest& request) {
     return options;
 }
 
+bool checkInterface(const StageInterface& interface, Diagnostics& diagnostics) {
+    if (const StageValue* value = interface.sharedAttribute())
+        diagnostics.warning(value->place->location, "OpenGL has no attribute left for the input " +
+                                                        inQuotes(value->semantic) +
+                                                        ": it shares one with another input");
+    const StageValue* unplaced = interface.unplaced();
+    if (unplaced)
+        diagnostics.error(unplaced->place->location, "there is no place left between the stages for " +
+                                                         inQuotes(unplaced->semantic) +
+                                                         ": use TEXCOORD0 to TEXCOORD15 as well");
+    return !unplaced;
+}
+
 void translate(const CompileRequest& request, SourceFiles& files, Diagnostics& diagnostics,
                CompileResult& result) {
     const std::uint32_t mainFile = files.add(request.fileName, request.source);
@@ -50,8 +65,13 @@ void translate(const CompileRequest& request, SourceFiles& files, Diagnostics& d
     } while (!diagnostics.hasErrors() && plainSamplers.size() > known);
     if (diagnostics.hasErrors())
         return;
+    VaryingPlaces ownPlaces;
+    const StageInterface interface(request.stage, program->values,
+                                   request.varyingPlaces ? *request.varyingPlaces : ownPlaces);
+    if (!checkInterface(interface, diagnostics))
+        return;
     const References references(*program);
-    GlslEmitter emitter(*program, types, request.stage, references);
+    GlslEmitter emitter(*program, types, interface, references);
     result.glsl = emitter.emit();
     result.parameters = listParameters(*program, references, emitter);
     result.ok = true;

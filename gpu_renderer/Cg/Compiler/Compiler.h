@@ -8,8 +8,10 @@
 
 /// The compiler's face: Cg source in; GLSL text, listing and parameters out.
 ///
-/// Thread: any; compilations share no state. No OpenGL is called.
+/// Thread: any; compilations share no state but what a request names. No OpenGL is called.
 namespace cg {
+
+class VaryingPlaces;
 
 enum class Stage { VERTEX, FRAGMENT };
 
@@ -35,6 +37,7 @@ struct CompileRequest {
     FileReader reader;                                       ///< empty: no include is found
     std::vector<std::pair<std::string, std::string>> macros; ///< name and text, as if defined in line 0
     std::vector<std::string> includeFolders;                 ///< searched after the including file's folder
+    VaryingPlaces* varyingPlaces = nullptr; ///< shared by programs that are to be drawn together; null: none
 };
 
 enum class ScalarKind { FLOAT, HALF, FIXED, INT, BOOL };

@@ -121,9 +121,9 @@ std::string filledIn(Name form, const Print& print) {
 
 } // namespace
 
-GlslEmitter::GlslEmitter(const TypedProgram& program, const TypeTable& types, Stage stage,
+GlslEmitter::GlslEmitter(const TypedProgram& program, const TypeTable& types, const StageInterface& interface,
                          const References& references)
-    : mProgram(program), mTypes(types), mReferences(references), mInterface(stage, program.values) {}
+    : mProgram(program), mTypes(types), mReferences(references), mInterface(interface) {}
 
 std::string GlslEmitter::emit() {
     nameGlobals();

@@ -17,7 +17,7 @@ namespace cg {
 /// Writes the typed tree out as a GLSL shader for people to read.
 class GlslEmitter {
 public:
-    GlslEmitter(const TypedProgram& program, const TypeTable& types, Stage stage,
+    GlslEmitter(const TypedProgram& program, const TypeTable& types, const StageInterface& interface,
                 const References& references);
 
     std::string emit();
@@ -72,7 +72,7 @@ private:
     const TypedProgram& mProgram;
     const TypeTable& mTypes;
     const References& mReferences;
-    const StageInterface mInterface;
+    const StageInterface& mInterface;
     GlslNames mNames;
     std::unordered_map<const Variable*, std::string> mVariableNames;
     std::unordered_map<const Variable*, std::string> mUniformNames; ///< of uniforms that work on a copy

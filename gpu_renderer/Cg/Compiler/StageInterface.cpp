@@ -2,7 +2,7 @@
 
 #include <algorithm>
 #include <cctype>
-#include <map>
+#include <optional>
 #include <set>
 
 namespace cg {
@@ -12,10 +12,11 @@ namespace {
 constexpr int TEXTURE_COORDINATES = 8;
 constexpr int ATTRIBUTES = 16;
 
-/// Locations of varyings: texture coordinates from the ninth on, those below, and others by their names.
+/// Locations of varyings, of which common drivers have 31: texture coordinates from the ninth on, those
+/// below, and VaryingPlaces.
 constexpr int FIRST_NAMED_LOCATION = TEXTURE_COORDINATES;
-constexpr int FIRST_HASHED_LOCATION = FIRST_NAMED_LOCATION + 3;
-constexpr int LOCATIONS = 31; ///< that common drivers have
+constexpr int FIRST_PLACE_LOCATION = FIRST_NAMED_LOCATION + 3;
+constexpr int NO_LOCATION = -1;
 
 /// A semantic and its number: TEXCOORD, 3.
 struct NumberedSemantic {
@@ -145,9 +146,8 @@ bool isDepth(const std::string& name) {
     return isOneOf(name, {"DEPTH", "DEPR", "SV_DEPTH"});
 }
 
-/// A location that follows from the semantic alone, as the stages are compiled apart and may carry different
-/// sets of them.
-int locationOf(const NumberedSemantic& semantic) {
+/// The location of a semantic that always has the same.
+int fixedLocation(const NumberedSemantic& semantic) {
     if (semantic.name == "TEXCOORD" && semantic.number < 2 * TEXTURE_COORDINATES)
         return semantic.number - TEXTURE_COORDINATES;
     if (semantic.number == 0) {
@@ -158,11 +158,7 @@ int locationOf(const NumberedSemantic& semantic) {
         if (isOneOf(semantic.name, {"BINORMAL", "BITANGENT"}))
             return FIRST_NAMED_LOCATION + 2;
     }
-    unsigned hash = 2166136261U;
-    for (const char c : semantic.name)
-        hash = (hash ^ static_cast<unsigned char>(c)) * 16777619U;
-    hash += static_cast<unsigned>(semantic.number); // so that those of one name never meet
-    return FIRST_HASHED_LOCATION + static_cast<int>(hash % (LOCATIONS - FIRST_HASHED_LOCATION));
+    return NO_LOCATION;
 }
 
 /// The name of a variable for a semantic that OpenGL has none for.
@@ -177,7 +173,7 @@ std::string freeName(const std::string& text, bool isAttribute) {
 
 } // namespace
 
-StageInterface::StageInterface(Stage stage, const std::vector<StageValue>& values)
+StageInterface::StageInterface(Stage stage, const std::vector<StageValue>& values, VaryingPlaces& places)
     : mStage(stage), mValues(values) {
     for (const StageValue& value : values) {
         const NumberedSemantic semantic = split(value.semantic);
@@ -185,8 +181,9 @@ StageInterface::StageInterface(Stage stage, const std::vector<StageValue>& value
             colourNumber(semantic) > 0)
             mHasSeveralColours = true;
     }
-    declareFree(values, false);
-    declareFree(values, true);
+    if (stage == Stage::VERTEX)
+        declareAttributes(freeValues(false));
+    declareVaryings(freeValues(stage == Stage::VERTEX), places);
 }
 
 StageSlot StageInterface::builtinSlot(const StageValue& value) const {
@@ -204,35 +201,59 @@ StageSlot StageInterface::builtinSlot(const StageValue& value) const {
     return {};
 }
 
-/// Locations of what has no built-in variable; the next one where two meet.
-void StageInterface::declareFree(const std::vector<StageValue>& values, bool isOutput) {
+/// What has no built-in variable, by the names of its variables: the first value of each.
+std::map<std::string, const StageValue*> StageInterface::freeValues(bool isOutput) const {
     const bool isAttribute = mStage == Stage::VERTEX && !isOutput;
-    std::map<std::string, NumberedSemantic> semantics; // by the names of their variables
-    for (const StageValue& value : values)
+    std::map<std::string, const StageValue*> free;
+    for (const StageValue& value : mValues)
         if (value.isOutput == isOutput && builtinSlot(value).glsl.empty())
-            semantics.emplace(freeName(value.semantic, isAttribute), split(value.semantic));
-    if (mStage == Stage::FRAGMENT && isOutput)
-        return; // OpenGL has nowhere to put it
+            free.emplace(freeName(value.semantic, isAttribute), &value);
+    return free;
+}
+
+/// The host finds them by their numbers; those without one count from 6 on, past those that are taken.
+void StageInterface::declareAttributes(const std::map<std::string, const StageValue*>& values) {
     std::set<int> taken;
-    for (const auto& [name, semantic] : semantics) {
-        int location = 0;
-        if (isAttribute) {
-            const bool isWeight = isOneOf(semantic.name, {"BLENDWEIGHT", "BLENDWEIGHTS"});
-            const bool isIndex = isOneOf(semantic.name, {"BLENDINDICES", "BLENDINDEX"});
-            location = isWeight                                                  ? 1
+    for (const auto& [name, value] : values) {
+        const NumberedSemantic semantic = split(value->semantic);
+        const bool isWeight = isOneOf(semantic.name, {"BLENDWEIGHT", "BLENDWEIGHTS"});
+        const bool isIndex = isOneOf(semantic.name, {"BLENDINDICES", "BLENDINDEX"});
+        int location = isWeight                                                  ? 1
                        : isIndex                                                 ? 7
                        : semantic.name == "ATTR" && semantic.number < ATTRIBUTES ? semantic.number
                                                                                  : 6;
-            for (int tries = 0; taken.count(location) != 0 && tries < ATTRIBUTES; ++tries)
-                location = (location + 1) % ATTRIBUTES;
-        } else {
-            location = locationOf(semantic);
-            for (int tries = 0; taken.count(location) != 0 && tries < LOCATIONS; ++tries)
-                location = (location + 1) % LOCATIONS;
-        }
-        taken.insert(location);
-        mDeclarations.push_back({name, location, isOutput});
+        for (int tries = 0; taken.count(location) != 0 && tries < ATTRIBUTES; ++tries)
+            location = (location + 1) % ATTRIBUTES;
+        if (!taken.insert(location).second && !mSharedAttribute)
+            mSharedAttribute = value;
+        mDeclarations.push_back({name, location, false});
     }
+}
+
+/// Names that have a place come first: the others go where there is room.
+void StageInterface::declareVaryings(const std::map<std::string, const StageValue*>& values,
+                                     VaryingPlaces& places) {
+    const bool isOutput = mStage == Stage::VERTEX;
+    std::map<std::string, int> locations;
+    std::set<int> taken;
+    const auto declare = [&](const std::string& name, std::optional<int> place) {
+        const bool isNew = place && taken.insert(*place).second;
+        locations[name] = FIRST_PLACE_LOCATION + place.value_or(0);
+        if (!isNew && !mUnplaced)
+            mUnplaced = values.at(name);
+    };
+    for (const auto& [name, value] : values) {
+        const int location = fixedLocation(split(value->semantic));
+        if (location != NO_LOCATION)
+            locations[name] = location;
+        else if (const std::optional<int> place = places.find(name))
+            declare(name, place);
+    }
+    for (const auto& [name, value] : values)
+        if (locations.count(name) == 0)
+            declare(name, places.add(name, taken));
+    for (const auto& [name, location] : locations)
+        mDeclarations.push_back({name, location, isOutput});
 }
 
 StageSlot StageInterface::slot(const StageValue& value) const {

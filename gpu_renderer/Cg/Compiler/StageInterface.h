@@ -3,7 +3,9 @@
 
 #include <Cg/Compiler/Compiler.h>
 #include <Cg/Compiler/TypedTree.h>
+#include <Cg/Compiler/VaryingPlaces.h>
 
+#include <map>
 #include <string>
 #include <vector>
 
@@ -19,8 +21,8 @@ struct StageSlot {
     std::string twin; ///< an output that is written along with it: gl_BackColor
 };
 
-/// A varying or a vertex attribute that is none of the built-in ones. Varyings meet by their location, which
-/// depends on the semantic alone; all are vec4.
+/// A varying or a vertex attribute that is none of the built-in ones. Varyings meet by their location; all
+/// are vec4.
 struct StageDeclaration {
     std::string name;
     int location = 0;
@@ -30,7 +32,14 @@ struct StageDeclaration {
 class StageInterface {
 public:
     /// @param values  all inputs and outputs of the stage
-    StageInterface(Stage stage, const std::vector<StageValue>& values);
+    /// @param places  takes in the varyings that it does not know
+    StageInterface(Stage stage, const std::vector<StageValue>& values, VaryingPlaces& places);
+
+    /// A varying that has to share its place with another one of the program; null where there is none.
+    const StageValue* unplaced() const { return mUnplaced; }
+
+    /// A vertex input that has to share its attribute with another one; null where there is none.
+    const StageValue* sharedAttribute() const { return mSharedAttribute; }
 
     StageSlot slot(const StageValue& value) const;
 
@@ -41,12 +50,16 @@ public:
 
 private:
     StageSlot builtinSlot(const StageValue& value) const;
-    void declareFree(const std::vector<StageValue>& values, bool isOutput);
+    std::map<std::string, const StageValue*> freeValues(bool isOutput) const;
+    void declareAttributes(const std::map<std::string, const StageValue*>& values);
+    void declareVaryings(const std::map<std::string, const StageValue*>& values, VaryingPlaces& places);
 
     const Stage mStage;
     const std::vector<StageValue>& mValues;
     bool mHasSeveralColours = false;
     std::vector<StageDeclaration> mDeclarations;
+    const StageValue* mUnplaced = nullptr;
+    const StageValue* mSharedAttribute = nullptr;
 };
 
 } // namespace cg

@@ -8,6 +8,8 @@
 #include "TextureUnits.h"
 #include "Uniforms.h"
 
+#include <Cg/Compiler/VaryingPlaces.h>
+
 #include <algorithm>
 #include <array>
 #include <cerrno>
@@ -21,6 +23,9 @@ namespace cg {
 namespace {
 
 HandleTable<CGprogram, Program> handles;
+
+/// Any vertex program may be drawn with any fragment program.
+VaryingPlaces varyingPlaces;
 
 using FilePointer = std::unique_ptr<std::FILE, int (*)(std::FILE*)>;
 
@@ -86,6 +91,7 @@ CGprogram compileInto(Context& context, Program::Origin origin, const char** arg
     request.stage = origin.profile == CG_PROFILE_GLSLV ? Stage::VERTEX : Stage::FRAGMENT;
     request.target = driver::glslTarget();
     request.reader = &readFile;
+    request.varyingPlaces = &varyingPlaces;
     addOptions(args, request);
 
     CompileResult compiled = compile(request);
