@@ -1,6 +1,7 @@
 // What Cg costs beside what OpenGL costs.
 //
-//   cg-translate   limit: OpenGL compiles and links a program's GLSL; translate: Cg to that GLSL
+//   cg-translate   limit: OpenGL compiles and links a program's GLSL; translate: Cg to that GLSL; the large
+//                  program is the effects of effects.cg twenty times over, all of them reached
 //   cg-switch      limit: a switch between linked pairs and a draw; switch: the same with bound Cg programs;
 //                  switch-and-enable: the profile enabled before and disabled after, as for one draw
 //   cg-set         limit: glProgramUniform4fv; set: cgGLSetParameter4fv
@@ -94,8 +95,22 @@ CGprogram makeProgram(CGcontext context, CGprofile profile, const char* entry) {
     return program;
 }
 
-void addTranslation(const char* file) {
-    const std::string source = textOf(file);
+/// Sets of effects one after another, each with its number in place of `#`, and an entry that applies all.
+std::string largeProgram(const std::string& effects) {
+    constexpr int SETS = 20;
+    std::string program;
+    std::string calls;
+    for (int set = 0; set < SETS; ++set) {
+        const std::string number = std::to_string(set);
+        for (const char c : effects)
+            program += c == '#' ? number : std::string(1, c);
+        calls += "    colour = effects_" + number + "(colour, picture, uv);\n";
+    }
+    return program + "float4 correct(float2 uv : TEXCOORD0, uniform sampler2D picture) : COLOR\n{\n" +
+           "    float4 colour = tex2D(picture, uv);\n" + calls + "    return colour;\n}\n";
+}
+
+void addTranslation(const std::string& source) {
     const cg::CompileResult result = translate(source);
     if (!result.ok)
         throw std::runtime_error(result.listing);
@@ -173,7 +188,8 @@ void addRows() {
     setenv("MESA_SHADER_CACHE_DISABLE", "true", 1);
     static const host::HeadlessContext context;
     makeTarget();
-    addTranslation(FWZEL_CG_PROGRAM);
+    addTranslation(textOf(FWZEL_CG_PROGRAM));
+    addTranslation(largeProgram(textOf(FWZEL_CG_EFFECTS)));
     addSwitching();
     addSetting();
 }
