@@ -136,6 +136,7 @@ void noteLock() {
 
 TEST_F(PboMapping, TheLockCoversTheMappingAloneAndAllOfTheUnmapping) {
     Texture texture(VideoTestImage::NO_TEST_PATTERN, pboArgs());
+    // cppcheck-suppress danglingLifetime ; locked in this test alone
     watchedMutex = &texture.mPboMutex;
     const SwappedEntryPoint bind(
         "glBindBuffer", epoxy_glBindBuffer, +[](GLenum, GLuint) { noteLock(); });

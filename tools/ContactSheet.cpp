@@ -33,6 +33,7 @@ std::array<unsigned char, 4> meanPixel(const host::PictureView& picture, uint32_
     for (uint32_t row = top; row < bottom; ++row)
         for (uint32_t column = left; column < right; ++column)
             for (size_t c = 0; c < sum.size(); ++c)
+                // cppcheck-suppress constStatement ; the braces of size_t{} are taken for a block
                 sum[c] += picture.row(row)[column * size_t{4} + c];
     const uint64_t count = uint64_t{right - left} * (bottom - top);
     return {static_cast<unsigned char>(sum[0] / count), static_cast<unsigned char>(sum[1] / count),

@@ -26,6 +26,7 @@ void CgParam::addCgParam(std::string name, uint32_t type, uint32_t size) {
 }
 
 void CgParam::addCgParam(std::string name, uint32_t type, uint32_t size, const float* value) {
+    // cppcheck-suppress accessMoved ; each overload has a name of its own
     declare(std::move(name), type, size).setValue(value);
 }
 

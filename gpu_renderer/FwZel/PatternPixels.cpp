@@ -37,6 +37,7 @@ using Pixel = PatternPixel;
 
 /// What a pattern is asked: a picture at one depth.
 struct Canvas : PatternPicture {
+    // cppcheck-suppress uninitDerivedMemberVar ; the base is copied whole
     explicit Canvas(const PatternPicture& picture)
         : PatternPicture(picture), depth(depthOf(picture.bytesPerColour)) {}
 

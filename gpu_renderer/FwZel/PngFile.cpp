@@ -240,6 +240,7 @@ void PngReading::readAdam7Rows(const Destination& to) {
 void PngReading::placePixels(const Destination& to, unsigned char* row, int pass) const {
     const uint8_t* pixel = mRow.get();
     const uint32_t step = PNG_PASS_COL_OFFSET(pass);
+    // cppcheck-suppress constStatement ; the braces of size_t{} are taken for a block
     for (size_t e = size_t{COMPONENTS} * PNG_PASS_START_COL(pass); e < to.elements;
          e += size_t{COMPONENTS} * step, pixel += COMPONENTS) {
         const size_t count = std::min<size_t>(COMPONENTS, to.elements - e);

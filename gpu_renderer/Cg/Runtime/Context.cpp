@@ -31,6 +31,7 @@ CGprogram Context::add(std::unique_ptr<Program> program) {
     try {
         mPrograms.push_back(std::move(program));
     } catch (...) { // no memory; the program is still the caller's
+        // cppcheck-suppress accessMoved ; nothing was moved by the call that threw
         program->retire();
         throw;
     }
@@ -64,6 +65,7 @@ CGcontext cgCreateContext() {
     try {
         cg::contexts.push_back(std::move(context));
     } catch (...) { // no memory; the context is still ours
+        // cppcheck-suppress accessMoved ; nothing was moved by the call that threw
         context->retire();
         throw;
     }
