@@ -14,8 +14,8 @@ constexpr uint32_t COMPONENTS = 4;
 Texture::TexArgs argsOf(uint8_t choice) {
     Texture::TexArgs args = FuzzedTexture::smallest();
     const bool isSmall = (choice & 1) != 0; // than most pictures
-    args.width = isSmall ? 3 : 40;
-    args.height = isSmall ? 4 : 30;
+    args.width = isSmall ? 3 : 9;
+    args.height = isSmall ? 2 : 7;
     args.pitchInPix = (choice & 2) != 0 ? args.width + 3 : args.width - 1;
     args.numColours = (choice & 4) != 0 ? 3 : COMPONENTS;
     args.numBytesPerColour = (choice & 8) != 0 ? 2 : 1;
