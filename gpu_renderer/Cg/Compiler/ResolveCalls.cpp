@@ -557,8 +557,12 @@ TypedExpr* Resolver::callFunction(SourceLocation at, const FunctionDecl* declara
             return nullptr;
         arguments.push_back(value);
     }
-    if (isOpaque(signatureOf(declaration).result))
-        return chosenSampler(at, declaration, arguments);
+    if (isOpaque(signatureOf(declaration).result)) {
+        if (!self)
+            return chosenSampler(at, declaration, arguments);
+        mDiagnostics.error(at, "a method cannot give a sampler");
+        return nullptr;
+    }
     std::vector<const Type*> types;
     for (std::size_t i = 0; i < parameters.size(); ++i) {
         const Type* argument = arguments[i]->type;

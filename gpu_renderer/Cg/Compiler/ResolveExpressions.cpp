@@ -187,8 +187,21 @@ TypedExpr* Resolver::useVariable(SourceLocation at, Variable* variable) {
     return mBuild.variable(at, variable);
 }
 
+namespace {
+
+/// A local sampler is only a name for another one.
+bool isUnsetSampler(const Variable* variable) {
+    return isOpaque(variable->type) && variable->storage == Variable::Storage::LOCAL && !variable->alias;
+}
+
+} // namespace
+
 /// Of a uniform array without a size only elements can be used: it is as long as they ask for.
 TypedExpr* Resolver::useName(const NameExpr* expr, Variable* variable) {
+    if (isUnsetSampler(variable)) {
+        mDiagnostics.error(expr->location, inQuotes(expr->name) + " has been given no sampler");
+        return nullptr;
+    }
     if (!variable->isUnsized || mIndexed == expr)
         return useVariable(expr->location, variable);
     mDiagnostics.error(expr->location,
@@ -674,6 +687,10 @@ TypedExpr* Resolver::samplerMember(SourceLocation at, TypedExpr* object, Name na
         count *= length;
     }
     Variable* piece = samplerPiece(root, path, index ? mTypes.array(type, count) : type);
+    if (isUnsetSampler(piece)) {
+        mDiagnostics.error(at, inQuotes(name) + " has been given no sampler");
+        return nullptr;
+    }
     TypedExpr* whole = useVariable(at, piece);
     return index ? mBuild.element(at, whole, index) : whole;
 }

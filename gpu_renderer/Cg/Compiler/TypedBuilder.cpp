@@ -411,6 +411,8 @@ TypedExpr* TypedBuilder::convert(TypedExpr* expression, const Type* to) {
     const Type* type = expression->type;
     if (type == to)
         return expression;
+    if (isFullMatrix(type) && to == mTypes.scalar(Scalar::BOOL))
+        return condition(expression);
     if (cost(expression, to) == IMPOSSIBLE) {
         mDiagnostics.error(expression->location,
                            "cannot convert from '" + nameOf(type) + "' to '" + nameOf(to) + "'");
