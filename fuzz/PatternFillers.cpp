@@ -1,3 +1,4 @@
+#include <FwZel/TestPatternCatalogue.h>
 #include <FwZel/VideoTestImage.h>
 
 #include <fixture/PatternWalk.h>
@@ -48,7 +49,7 @@ void require(const std::string& fault) {
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
     Numbers numbers(data, size);
     PatternRegion region = {};
-    region.pattern = numbers.upTo(22); // one that is none too
+    region.pattern = numbers.upTo(NUM_TEST_PATTERNS); // one that is none too
     region.width = numbers.sizeUpTo(600);
     region.height = numbers.sizeUpTo(200);
     region.field = numbers.upTo(3);

@@ -1,3 +1,4 @@
+#include <FwZel/TestPatternCatalogue.h>
 #include <FwZel/VideoTestImage.h>
 
 #include <fixture/PatternWalk.h>
@@ -10,6 +11,7 @@
 #include <array>
 #include <cstdint>
 #include <cstring>
+#include <iterator>
 #include <random>
 #include <string>
 #include <vector>
@@ -171,13 +173,14 @@ uint64_t digestOf(const std::vector<unsigned char>& bytes, uint64_t digest = 0xC
 }
 
 TEST(Fillers, WholePicturesAreWhatTheyWereWhenFirstLookedAt) {
-    constexpr uint64_t DIGESTS[22] = {
+    constexpr uint64_t DIGESTS[] = {
         0xD5E38AF81C48D481, 0xB904A26DFF3A2639, 0xB2EE56A457DAB9A5, 0x7724280579012275, 0x36CDCA23D9E76CE5,
         0x07BD298DBB9BDCF5, 0xCC12319193ADD039, 0xFCB11AB840CD3139, 0x2EA0A95B577880C5, 0x4625B490382C8AA1,
         0xD7CD887D24001975, 0x969E1A6793FC8A25, 0xCADDDB47CFB99425, 0x4904E86421159979, 0x61D75498A93C837A,
         0xA6925E037D175031, 0xA24E730CB0E839E5, 0x39AF3F3798004525, 0x6BE07E97DAAC8B85, 0x3A6231D4F85749E1,
         0xBC832EA48B536B25, 0xD8D518572089DD25};
-    for (uint32_t pattern = 0; pattern < 22; ++pattern) {
+    static_assert(std::size(DIGESTS) == NUM_TEST_PATTERNS);
+    for (uint32_t pattern = 0; pattern < NUM_TEST_PATTERNS; ++pattern) {
         std::vector<unsigned char> frame(1920 * 1080 * 4);
         std::vector<unsigned char> field(960 * 270 * 8);
         std::vector<unsigned char> plane(960 * 270 * 4);
@@ -207,6 +210,6 @@ TEST(Fillers, SweepsOfEveryWidthEqualTheWalkOverPixels) {
     expectSweep(16, 3000); // the phases leave the estimated ones in the middle of a run
 }
 
-INSTANTIATE_TEST_SUITE_P(EveryPattern, PatternFillers, testing::Range(0U, 23U));
+INSTANTIATE_TEST_SUITE_P(EveryPattern, PatternFillers, testing::Range(0U, NUM_TEST_PATTERNS + 1));
 
 } // namespace

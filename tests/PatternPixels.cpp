@@ -169,8 +169,8 @@ std::string nameOf(const testing::TestParamInfo<Parameters>& info) {
 }
 
 INSTANTIATE_TEST_SUITE_P(EveryPattern, PatternPixels,
-                         testing::Combine(testing::Range(0U, 22U), testing::Values(1U, 2U, 4U, 3U),
-                                          testing::Values(0U, 1U, 2U, 3U)),
+                         testing::Combine(testing::Range(0U, NUM_TEST_PATTERNS),
+                                          testing::Values(1U, 2U, 4U, 3U), testing::Values(0U, 1U, 2U, 3U)),
                          nameOf);
 
 struct Sample {
@@ -213,7 +213,7 @@ TEST(PatternSamples, LandmarksOfEachPattern) {
         {{Image::COLOUR_BAR_75, 7, H, 1, 2}, 6, 0, {255, 255, 255, 255}},
         {{Image::H_SWEEP, W, H, 1, 2}, 0, 0, {127, 127, 127, 255}},
         {{Image::COLOUR_MAT_BLACK, W, H, 1, 2}, 0, 0, {0, 0, 0, 255}},
-        {{22, W, H, 4, 2}, 0, 0, {0, 0, 0, 0}},
+        {{NUM_TEST_PATTERNS, W, H, 4, 2}, 0, 0, {0, 0, 0, 0}},
         {{Image::NO_TEST_PATTERN, W, H, 1, 2}, 9, 9, {0, 0, 0, 0}},
     };
     for (const Sample& sample : samples) {

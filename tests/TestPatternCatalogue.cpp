@@ -24,8 +24,9 @@ TEST(TestPatternCatalogue, FindsEachPatternByNameAndNumber) {
 }
 
 TEST(TestPatternCatalogue, KnowsNothingElse) {
-    for (const char* const text : {"", "22", "-1", "+1", "01", " 1", "1 ", "4294967296", "4294967295",
-                                   "COMBI", "no-test-pattern", "colour_bar_75"})
+    EXPECT_EQ(findTestPattern(std::to_string(NUM_TEST_PATTERNS)), nullptr);
+    for (const char* const text : {"", "-1", "+1", "01", " 1", "1 ", "4294967296", "4294967295", "COMBI",
+                                   "no-test-pattern", "colour_bar_75"})
         EXPECT_EQ(findTestPattern(text), nullptr) << '"' << text << '"';
     EXPECT_EQ(findTestPattern(VideoTestImage::NO_TEST_PATTERN), nullptr);
 }

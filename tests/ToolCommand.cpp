@@ -150,7 +150,7 @@ TEST(Tool, WrongCallsAreRefusedWithTheReason) {
         {"info", "FILE is required"},
         {"pattern combi", "--output is required"},
         {"pattern bars -o OUT.png", "\"bars\" is no pattern"},
-        {"pattern 22 -o OUT.png", "\"22\" is no pattern"},
+        {"pattern 99 -o OUT.png", "\"99\" is no pattern"},
         {"pattern combi -o OUT.tif", "the extension tells no format"},
         {"pattern combi -o OUT.png --format tiff", "--format: tiff not in {png,ppm,raw}"},
         {"pattern combi -o OUT.png --size 1920", "--size: \"1920\" is no size"},

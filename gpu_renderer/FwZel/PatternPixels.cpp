@@ -1,6 +1,7 @@
 #include <FwZel/PatternPixels.h>
 
 #include <FwZel/SineEstimate.h>
+#include <FwZel/TestPatternCatalogue.h>
 #include <FwZel/VideoTestImage.h>
 
 #include <algorithm>
@@ -376,7 +377,7 @@ constexpr Operations PATTERNS[] = {
     OF<ColourMatBlack>, OF<ColourMatWhite>,
 };
 constexpr uint32_t NUM_PATTERNS = sizeof PATTERNS / sizeof PATTERNS[0];
-static_assert(NUM_PATTERNS == VideoTestImage::COLOUR_MAT_WHITE + 1, "one entry for each pattern number");
+static_assert(NUM_PATTERNS == NUM_TEST_PATTERNS, "one entry for each pattern number");
 
 const Operations& operationsOf(uint32_t pattern) {
     static constexpr Operations NONE = OF<NoPattern>;
