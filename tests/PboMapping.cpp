@@ -194,40 +194,59 @@ TEST_F(PboMapping, FailuresOfOpenGlFlushStandardOutput) {
     glBindBuffer(GL_PIXEL_UNPACK_BUFFER, 0);
 }
 
-// The mapping is awaited as a host would agree on it between its threads: by a frame counter of its own.
-TEST_F(PboMapping, EveryFrameOfAProducerThreadArrivesWhole) {
-    constexpr uint32_t BUFFERS = 4;
-    constexpr int FRAMES = 2000;
+/// The bytes of a producer's frame, all of them different from those of the frames around it.
+std::vector<uint8_t> frameOf(int round, size_t bytes) {
+    std::vector<uint8_t> frame(bytes);
+    for (size_t i = 0; i < bytes; ++i)
+        frame[i] = static_cast<uint8_t>(static_cast<size_t>(round) * 29 + i * 7);
+    return frame;
+}
+
+// One producer a buffer. While the render thread unmaps, uploads and maps one, the others write theirs. When
+// a producer may write is agreed as a host would do it: by counters of the host's own.
+TEST_F(PboMapping, EveryFrameOfTheProducersArrivesWhole) {
+    constexpr size_t BUFFERS = 4;
+    constexpr int ROUNDS = 10000;
     Texture texture(VideoTestImage::NO_TEST_PATTERN, pboArgs(GL_WRITE_ONLY, BUFFERS));
     const size_t frameBytes = texture.pixelBytes();
-    std::atomic<int> framesMapped{0};
-    std::atomic<int> framesWritten{0};
-    std::thread producer([&] {
-        for (int frame = 0; frame < FRAMES; ++frame) {
-            while (framesMapped.load(std::memory_order_acquire) <= frame) {
-                (void)texture.getPboOffset(static_cast<uint32_t>(frame));
-                std::this_thread::yield();
+    std::array<std::atomic<int>, BUFFERS> mapped{}; // rounds of each buffer
+    std::array<std::atomic<int>, BUFFERS> written{};
+    const auto await = [](const std::atomic<int>& counter, int round) {
+        while (counter.load(std::memory_order_acquire) <= round)
+            std::this_thread::yield();
+    };
+    std::vector<std::thread> producers;
+    for (uint32_t b = 0; b < BUFFERS; ++b)
+        producers.emplace_back([&, b] {
+            for (int round = 0; round < ROUNDS; ++round) {
+                await(mapped[b], round);
+                const std::vector<uint8_t> frame = frameOf(round + static_cast<int>(b), frameBytes);
+                std::memcpy(texture.getAlignedPboPtr(b), frame.data(), frameBytes);
+                written[b].store(round + 1, std::memory_order_release);
+                (void)texture.getPboOffset(b + 1); // any thread may read any of them at any time
+                (void)texture.getPboPtr(b + 1);
             }
-            std::memset(texture.getAlignedPboPtr(static_cast<uint32_t>(frame)), frame & 0xFF, frameBytes);
-            framesWritten.store(frame + 1, std::memory_order_release);
-        }
-    });
+        });
     std::vector<uint8_t> arrived(frameBytes);
     int badFrames = 0;
-    for (int frame = 0; frame < FRAMES; ++frame) {
-        const auto b = static_cast<uint32_t>(frame);
-        texture.mapPbo(b);
-        framesMapped.store(frame + 1, std::memory_order_release);
-        while (framesWritten.load(std::memory_order_acquire) <= frame)
-            std::this_thread::yield();
-        texture.unmapPbo(b);
-        texture.copyPBOToGLTex(b);
-        glBindTexture(GL_TEXTURE_2D, texture.getGLTexID(b));
-        glGetTexImage(GL_TEXTURE_2D, 0, GL_RGBA, GL_UNSIGNED_BYTE, arrived.data());
-        glBindTexture(GL_TEXTURE_2D, 0);
-        badFrames += arrived != std::vector<uint8_t>(frameBytes, static_cast<uint8_t>(frame & 0xFF));
-    }
-    producer.join();
+    for (int round = 0; round <= ROUNDS; ++round)
+        for (uint32_t b = 0; b < BUFFERS; ++b) {
+            if (round > 0) {
+                await(written[b], round - 1);
+                texture.unmapPbo(b);
+                texture.copyPBOToGLTex(b);
+                glBindTexture(GL_TEXTURE_2D, texture.getGLTexID(b));
+                glGetTexImage(GL_TEXTURE_2D, 0, GL_RGBA, GL_UNSIGNED_BYTE, arrived.data());
+                glBindTexture(GL_TEXTURE_2D, 0);
+                badFrames += arrived != frameOf(round - 1 + static_cast<int>(b), frameBytes);
+            }
+            if (round < ROUNDS) {
+                texture.mapPbo(b);
+                mapped[b].store(round + 1, std::memory_order_release);
+            }
+        }
+    for (std::thread& producer : producers)
+        producer.join();
     EXPECT_EQ(badFrames, 0);
 }
 
