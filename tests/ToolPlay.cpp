@@ -249,10 +249,26 @@ TEST_F(ToolPlay, WhatFailsIsNamedWithTheReason) {
 }
 
 TEST_F(ToolPlay, WhatTheContextLacksIsNamedBeforeAnythingIsBuilt) {
-    const ToolRun run = play("combi --size 8x8", "MESA_GL_VERSION_OVERRIDE=2.1");
-    EXPECT_EQ(run.exitCode, 1);
-    EXPECT_NE(run.remarks.find("lacks shaders of GLSL 3.30 (OpenGL 3.3)\n"), std::string::npos)
-        << run.remarks;
+    const struct {
+        const char* environment;
+        const char* missing;
+    } cases[] = {
+        {"MESA_GL_VERSION_OVERRIDE=2.1", "shaders of GLSL 3.30 (OpenGL 3.3)\n"},
+        {"MESA_EXTENSION_OVERRIDE=-GL_ARB_texture_non_power_of_two", " lacks textures of any size ("},
+        {"MESA_EXTENSION_OVERRIDE=-GL_EXT_framebuffer_object", " lacks framebuffers and mip maps ("},
+        {"MESA_EXTENSION_OVERRIDE=-GL_ARB_pixel_buffer_object", " lacks readback through pixel buffers ("},
+        {"MESA_GL_VERSION_OVERRIDE=1.4 MESA_EXTENSION_OVERRIDE=-GL_ARB_copy_buffer",
+         "copies between buffers ("},
+        {"MESA_GL_VERSION_OVERRIDE=1.4 MESA_EXTENSION_OVERRIDE=-GL_ARB_vertex_buffer_object", " lacks "},
+        {"MESA_GL_VERSION_OVERRIDE=3.3COMPAT MESA_EXTENSION_OVERRIDE=-GL_ARB_separate_shader_objects",
+         " lacks "},
+    };
+    for (const auto& c : cases) {
+        SCOPED_TRACE(c.environment);
+        const ToolRun run = play("combi --size 8x8", c.environment);
+        EXPECT_EQ(run.exitCode, 1);
+        EXPECT_NE(run.remarks.find(c.missing), std::string::npos) << run.remarks;
+    }
 }
 
 } // namespace
