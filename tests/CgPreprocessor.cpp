@@ -334,10 +334,12 @@ TEST(CgNumberSpelling, ReadsEveryForm) {
         {"1.5h.xy", Kind::HALF, 1.5, 4},  {"3.xyz", Kind::INTEGER, 3, 1},
         {"1.x", Kind::FIXED, 1, 3},       {"1e999", Kind::FLOAT, std::numeric_limits<double>::infinity(), 5},
         {"1e-999", Kind::FLOAT, 0, 6},    {"2.0lf", Kind::FLOAT, 2, 5},
-        {"08f", Kind::FLOAT, 8, 3},       {"2D", Kind::INVALID, 0, 0},
+        {"08f", Kind::FLOAT, 8, 3},       {"2E", Kind::INVALID, 0, 0},
         {"1.2.3", Kind::INVALID, 0, 0},   {"09", Kind::INVALID, 0, 0},
         {"1e+", Kind::INVALID, 0, 0},     {"0x1G", Kind::INVALID, 0, 0},
-        {"1ff", Kind::INVALID, 0, 0},
+        {"1ff", Kind::INVALID, 0, 0},     {"1.5d", Kind::FLOAT, 1.5, 4},
+        {"2D", Kind::FLOAT, 2, 2},        {"7us", Kind::UNSIGNED, 7, 3},
+        {"7i", Kind::INTEGER, 7, 2},
     };
     for (const Number& one : numbers) {
         SCOPED_TRACE(one.text);

@@ -77,11 +77,15 @@ bool isSwizzle(std::string_view rest) {
     return true;
 }
 
+bool isLength(char suffix) {
+    return suffix == 'l' || suffix == 'i' || suffix == 's' || suffix == 't';
+}
+
 NumberSpelling::Kind withSuffix(std::string_view text, NumberSpelling& number, bool isWhole) {
     using Kind = NumberSpelling::Kind;
     const char suffix = number.length < text.size() ? lower(text[number.length]) : '\0';
     const char second = number.length + 1 < text.size() ? lower(text[number.length + 1]) : '\0';
-    if (suffix == 'f' || suffix == 'h' || suffix == 'x') {
+    if (suffix == 'f' || suffix == 'h' || suffix == 'x' || suffix == 'd') {
         ++number.length;
         return suffix == 'h' ? Kind::HALF : suffix == 'x' ? Kind::FIXED : Kind::FLOAT;
     }
@@ -91,8 +95,9 @@ NumberSpelling::Kind withSuffix(std::string_view text, NumberSpelling& number, b
     }
     if (!isWhole)
         return Kind::FLOAT;
-    const bool hasTwo = (suffix == 'u' && second == 'l') || (suffix == 'l' && second == 'u');
-    if (suffix == 'u' || suffix == 'l')
+    // An int of any length, `l` long, `i` int, `s` short and `t` char, is an int.
+    const bool hasTwo = (suffix == 'u' && isLength(second)) || (suffix == 'l' && second == 'u');
+    if (suffix == 'u' || isLength(suffix))
         number.length += hasTwo ? 2 : 1;
     return suffix == 'u' || hasTwo ? Kind::UNSIGNED : Kind::INTEGER;
 }
