@@ -226,6 +226,8 @@ TypedExpr* Resolver::name(const NameExpr* expr) {
     }
     if (Variable* variable = outliveLoop(expr->location, expr->name))
         return useVariable(expr->location, variable);
+    if (Variable* variable = ownValue(expr))
+        return mBuild.variable(expr->location, variable);
     std::vector<Name> known;
     for (const ScopeEntry& entry : mContext.scope)
         if (entry.variable)
@@ -235,6 +237,17 @@ TypedExpr* Resolver::name(const NameExpr* expr) {
     mDiagnostics.error(expr->location,
                        "undeclared name " + inQuotes(expr->name) + suggestion(expr->name, known));
     return nullptr;
+}
+
+/// The variable within its own initial value, `float sum = sum + 1;`: as in C it is in scope, but has no
+/// value. What else has the name comes first.
+Variable* Resolver::ownValue(const NameExpr* expr) {
+    Variable* variable = mContext.declared;
+    if (!variable || !variable->type || variable->name != expr->name)
+        return nullptr;
+    mDiagnostics.warning(expr->location, inQuotes(expr->name) + " is used before it has a value");
+    mContext.isDeclaredUsed = true;
+    return variable;
 }
 
 /// "; did you mean 'length'?", or nothing.

@@ -165,8 +165,11 @@ void Resolver::declareLocal(const VariableDecl* declaration, std::vector<TypedSt
         mContext.scope.push_back({definition->name, nullptr, structType(definition)});
     Variable* variable = makeVariable(Variable::Storage::LOCAL, declaration->name, type, declaration);
     TypedExpr* value = nullptr;
+    mContext.isDeclaredUsed = false;
     if (type && declaration->initializer && !isOpaque(type)) {
+        mContext.declared = variable;
         value = initializer(type, declaration->initializer);
+        mContext.declared = nullptr;
         variable->type = type;
         if (!value)
             type = nullptr;
@@ -184,16 +187,24 @@ void Resolver::declareLocal(const VariableDecl* declaration, std::vector<TypedSt
     if (!variable->type)
         variable->type = mTypes.scalar(Scalar::FLOAT); // after an error: the name is known at least
     variable->isConst = declaration->qualifiers.isConst;
-    if (variable->isConst)
+    if (variable->isConst && !mContext.isDeclaredUsed)
         variable->initializer = value;
     mContext.scope.push_back({declaration->name, variable, nullptr});
     if (!isSized || isOpaque(variable->type))
         return;
     if (value && containsSampler(variable->type))
         aliasSamplers(declaration->location, mBuild.variable(declaration->location, variable), value);
+    TypedExpr* assigned = nullptr;
+    if (value && mContext.isDeclaredUsed) { // GLSL knows the name only behind the initial value
+        assigned =
+            mBuild.assign(declaration->location, mBuild.variable(declaration->location, variable), value);
+        value = nullptr;
+    }
     TypedStmt* stmt = make(mArena, TypedStmt::Kind::DECLARE, value);
     stmt->variable = variable;
     out.push_back(stmt);
+    if (assigned)
+        out.push_back(make(mArena, TypedStmt::Kind::EXPR, assigned));
 }
 
 TypedStmt* Resolver::forLoop(const ForStmt* stmt) {

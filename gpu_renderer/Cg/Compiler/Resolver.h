@@ -52,6 +52,8 @@ private:
         std::vector<LoopVariable> pastLoops;           ///< of the blocks around
         std::vector<TypedStmt*>* statements = nullptr; ///< of the innermost block
         Variable* self = nullptr;                      ///< a method's object
+        Variable* declared = nullptr;                  ///< the one whose initial value is being resolved
+        bool isDeclaredUsed = false;                   ///< that value names its own variable
         std::size_t ordinal = 0;                       ///< of the function's declaration
     };
 
@@ -116,6 +118,7 @@ private:
     void declareLocal(const VariableDecl* declaration, std::vector<TypedStmt*>& out);
     TypedStmt* forLoop(const ForStmt* stmt);
     Variable* outliveLoop(SourceLocation at, Name name);
+    Variable* ownValue(const NameExpr* expr);
     TypedStmt* returnStatement(const JumpStmt* stmt);
     TypedStmt* discardStatement(const JumpStmt* stmt);
     TypedStmt* switchStatement(const SwitchStmt* stmt);
