@@ -561,6 +561,8 @@ TEST(CgParser, BoundsNesting) {
               std::vector<std::string>());
     EXPECT_EQ(Parsed("void f() { " + repeated("a = 1;", DEEP) + "}").messages(), std::vector<std::string>());
     EXPECT_EQ(Parsed("float x = 1" + repeated("+1", 500) + ";").messages(), std::vector<std::string>());
+    EXPECT_EQ(Parsed("void f() { " + repeated("if (a) ; else ", 500) + ";}").messages(),
+              std::vector<std::string>());
 }
 
 } // namespace

@@ -12,6 +12,9 @@ namespace cg {
 
 namespace {
 
+/// `else if` in a row as drivers take them; a software renderer masks no more than some 80 levels.
+constexpr int MAX_CHAIN = 32;
+
 using Kind = TypedExpr::Kind;
 
 /// How strongly GLSL's operators bind.
@@ -117,6 +120,14 @@ std::string filledIn(Name form, const Print& print) {
             text += form[i];
     }
     return text;
+}
+
+/// The `if` that stands alone behind an `else`; null where there is none.
+const TypedStmt* chained(const TypedStmt* stmt) {
+    const TypedStmt* otherwise = stmt->body[1];
+    const bool isChained =
+        otherwise && otherwise->body.size() == 1 && otherwise->body[0]->kind == TypedStmt::Kind::IF;
+    return isChained ? otherwise->body[0] : nullptr;
 }
 
 } // namespace
@@ -458,7 +469,7 @@ void GlslEmitter::statement(const TypedStmt* stmt) {
         effect(stmt->expression);
         break;
     case StmtKind::IF:
-        branch(stmt, false);
+        branch(stmt);
         break;
     case StmtKind::FOR:
         forLoop(stmt);
@@ -496,18 +507,40 @@ void GlslEmitter::statement(const TypedStmt* stmt) {
     }
 }
 
-void GlslEmitter::branch(const TypedStmt* stmt, bool isElse) {
-    line((isElse ? "} else if (" : "if (") + print(stmt->expression) + ") {");
+/// An `if` with all its `else if`. Drivers take a chain as one nested within the other, and not any number of
+/// them: what comes behind MAX_CHAIN stands in an `if` of its own.
+void GlslEmitter::branch(const TypedStmt* stmt) {
+    const TypedStmt* rest = stmt;
+    for (int links = 0; rest && links < MAX_CHAIN; ++links)
+        rest = chained(rest);
+    if (rest) {
+        line("{");
+        ++mIndent;
+        line("bool cg_rest = false;");
+    }
+    line("if (" + print(stmt->expression) + ") {");
     block(stmt->body[0]->body);
-    const TypedStmt* otherwise = stmt->body[1];
-    if (otherwise) {
-        const bool isChain = otherwise->body.size() == 1 && otherwise->body[0]->kind == TypedStmt::Kind::IF;
-        if (isChain) {
-            branch(otherwise->body[0], true);
-            return;
-        }
+    const TypedStmt* last = stmt;
+    for (const TypedStmt* next = chained(last); next != rest; next = chained(last)) {
+        line("} else if (" + print(next->expression) + ") {");
+        block(next->body[0]->body);
+        last = next;
+    }
+    if (rest) {
         line("} else {");
-        block(otherwise->body);
+        ++mIndent;
+        line("cg_rest = true;");
+        --mIndent;
+        line("}");
+        line("if (cg_rest) {");
+        ++mIndent;
+        branch(rest);
+        --mIndent;
+        line("}");
+        --mIndent;
+    } else if (last->body[1]) {
+        line("} else {");
+        block(last->body[1]->body);
     }
     line("}");
 }

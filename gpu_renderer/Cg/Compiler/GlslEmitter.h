@@ -40,7 +40,7 @@ private:
 
     void statement(const TypedStmt* stmt);
     void block(const std::vector<TypedStmt*>& body);
-    void branch(const TypedStmt* stmt, bool isElse);
+    void branch(const TypedStmt* stmt);
     void declaration(const TypedStmt* stmt);
     void forLoop(const TypedStmt* stmt);
     std::string forInitializer(const TypedStmt* stmt);

@@ -14,6 +14,9 @@ namespace {
 
 constexpr Name ASSEMBLY = "asm";
 
+/// `else if` in a row, with those of the chains around: each is one level more for what reads the tree.
+constexpr int MAX_LINKS = 500;
+
 /// Qualifiers that change nothing. They are ordinary names where no type follows.
 bool isEmptyQualifier(Name word) {
     static const std::unordered_set<Name> WORDS{
@@ -614,15 +617,52 @@ private:
         return condition;
     }
 
+    /// With all its `else if`: a table of rules is one long chain and not nested as it is read.
     Stmt* parseIf() {
+        Chain chain(*this);
+        IfStmt* const first = parseThen();
+        IfStmt* last = first;
+        while (takeWord("else")) {
+            if (!isAtWord("if")) {
+                last->elseBranch = parseBranch();
+                break;
+            }
+            chain.lengthen();
+            IfStmt* const next = parseThen();
+            last->elseBranch = next;
+            last = next;
+        }
+        return first;
+    }
+
+    IfStmt* parseThen() {
         auto* const statement = make<IfStmt>(token().location);
         pass();
         statement->condition = parseCondition("after 'if'");
         statement->thenBranch = parseBranch();
-        if (takeWord("else"))
-            statement->elseBranch = parseBranch();
         return statement;
     }
+
+    /// The `else if` that a statement has before it, which count for as long as this lives; the bound is a
+    /// syntax error.
+    class Chain {
+    public:
+        explicit Chain(Parser& parser) : mParser(parser), mOuterLinks(parser.mLinks) {}
+        ~Chain() { mParser.mLinks = mOuterLinks; }
+        Chain(const Chain&) = delete;
+        Chain& operator=(const Chain&) = delete;
+
+        void lengthen() {
+            if (mParser.mLinks == MAX_LINKS)
+                mParser.refuse(mParser.token().location,
+                               "more than " + std::to_string(MAX_LINKS) + " 'else if' in a row");
+            ++mParser.mLinks;
+        }
+
+    private:
+        Parser& mParser;
+        int mOuterLinks;
+    };
 
     /// What is declared in it without braces is not seen behind it.
     Stmt* parseBranch() {
@@ -722,6 +762,7 @@ private:
     }
 
     int mSwitchDepth = 0;
+    int mLinks = 0;
     bool mHasUnclosed = false;
 };
 
