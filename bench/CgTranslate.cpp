@@ -134,6 +134,11 @@ void addSwitching() {
     const std::string fragment = "#version 330 compatibility\nuniform vec4 value2;\n"
                                  "void main() { gl_FragColor = value2; }\n";
     const std::array<GLuint, 2> pairs = {link(vertex, fragment), link(vertex, fragment)};
+    // A driver finishes its compilation at the first draw, and a row is warmed up with one of the two.
+    for (const GLuint pair : pairs) {
+        glUseProgram(pair);
+        draw();
+    }
     addLimit("cg-switch/1", 0, [pairs, which = size_t{0}]() mutable {
         which = 1 - which;
         glUseProgram(pairs[which]);
@@ -149,6 +154,13 @@ void addSwitching() {
         cgGLEnableProfile(CG_PROFILE_GLSLF);
         cgGLBindProgram(place);
     };
+    enable();
+    for (CGprogram show : shows) {
+        cgGLBindProgram(show);
+        draw();
+    }
+    cgGLDisableProfile(CG_PROFILE_GLSLF);
+    cgGLDisableProfile(CG_PROFILE_GLSLV);
     addRow(
         "cg-switch/1/switch", 0,
         [shows, which = size_t{0}]() mutable {

@@ -31,12 +31,7 @@ private:
 };
 
 fs::path folderWithCg() {
-    std::error_code error;
-    fs::path installed =
-        fs::read_symlink("/proc/self/exe", error).parent_path().parent_path() / "share/fwzel";
-    if (fs::exists(installed / "Cg/vertex.cg", error))
-        return installed;
-    return FWZEL_HOST_FOLDER;
+    return (fs::read_symlink("/proc/self/exe").parent_path() / FWZEL_DATA_FOLDER).lexically_normal();
 }
 
 void throwIfUnreadable(const std::string& file) {

@@ -7,10 +7,9 @@
 
 namespace host {
 
-/// Path of one of the Cg programs that come with the host, such as "texture.cg": in the folder
-/// share/fwzel/Cg of the installation that the executable belongs to, else in the source tree that it was
-/// built from.
-/// @throw std::runtime_error  it is in neither
+/// Path of one of the Cg programs that come with the host, such as "texture.cg": in ../share/fwzel/Cg as seen
+/// from the folder of the executable. An installation has them there, and so has the build folder.
+/// @throw std::runtime_error  it is not there
 std::string cgProgramPath(const std::string& name);
 
 /// The library's default vertex program. Shader asks for "Cg/vertex.cg" relative to the working directory;

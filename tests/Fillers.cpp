@@ -126,6 +126,20 @@ TEST(Fillers, IndicesWrapAt32Bits) {
     }
 }
 
+TEST(Fillers, IndicesOfFlatColoursWrapAt32Bits) {
+    constexpr size_t INDICES = size_t{1} << 32;
+    for (const uint32_t bytes : {1U, 2U, 4U}) {
+        const WrappedBuffer plane(INDICES * bytes);
+        Image::fillColourPlanar(plane.start(), 40, 2, 0U - 10, bytes, 0x01010101);
+        EXPECT_EQ(plane.start()[INDICES * bytes - 1], 1) << "the tenth pixel of line 1, of " << bytes;
+        EXPECT_EQ(plane.start()[40 * bytes - 1], 1);
+    }
+    const WrappedBuffer packed(INDICES);
+    uint32_t colour[] = {1, 1, 1, 1};
+    Image::fillColour(packed.start(), 40, 2, (1U << 30) - 10, colour);
+    EXPECT_EQ(packed.start()[INDICES - 1], 1);
+}
+
 TEST(Fillers, RegionsThatPassTheLastIndexAreEmpty) {
     unsigned char byte = 7;
     Image::fillTestPattern(&byte, Image::COL_RGBA, 8, 8, 8, Image::H_RAMP, 2, 8, 0, 0xFFFFFFFF, 1, false);

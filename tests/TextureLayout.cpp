@@ -1,5 +1,6 @@
 #include <fixture/GlTest.h>
 
+#include <FwZel/PictureSize.h>
 #include <FwZel/Texture.h>
 #include <FwZel/VideoTestImage.h>
 
@@ -126,11 +127,13 @@ TEST_F(TextureLayout, EachBufferHoldsItsField) {
     struct Case {
         bool isInterlaced;
         std::vector<uint32_t> fields;
+        bool isFp16 = false;
     };
-    const Case cases[] = {{false, {2, 2}}, {true, {0}}, {true, {0, 1, 0, 1}}};
+    const Case cases[] = {{false, {2, 2}}, {true, {0}}, {true, {0, 1, 0, 1}}, {true, {0, 1}, true}};
     for (const Case& c : cases) {
         Texture::TexArgs args = smallArgs();
         args.isInterlaced = c.isInterlaced;
+        args.isFp16 = c.isFp16;
         args.height = 24;
         args.width = args.pitchInPix = 64;
         args.numBuffers = static_cast<uint32_t>(c.fields.size());
@@ -142,7 +145,7 @@ TEST_F(TextureLayout, EachBufferHoldsItsField) {
             fieldArgs.numBuffers = 1;
             fieldArgs.height = texture.getHeight();
             Texture expected(VideoTestImage::NO_TEST_PATTERN, fieldArgs);
-            VideoTestImage::fillTexturePattern(&expected, VideoTestImage::CIRCLE, 0, c.fields[i], false);
+            VideoTestImage::fillTexturePattern(&expected, VideoTestImage::CIRCLE, 0, c.fields[i], c.isFp16);
             EXPECT_EQ(rowsOf(texture, i), rowsOf(expected, 0)) << "buffer " << i;
         }
     }
@@ -221,6 +224,8 @@ TEST_F(TextureLayout, AHostBufferOfTwoGigabytesIsRefused) {
         {"wraps to 0 in 64 bits", 0x80000000, 0x80000000, 4, 1, false},
         {"a pitch that wraps alone", 1, 0x40000000, 4, 1, false},
     };
+    static_assert(pictureFits(0x7FFFFFFF, 1, 1) && !pictureFits(0x80000000, 1, 1));
+    static_assert(pictureFits(0x1FFFFFFF, 1, 4) && !pictureFits(0x20000000, 1, 4));
     for (const Case& c : cases) {
         SCOPED_TRACE(c.name);
         Texture::TexArgs args = smallArgs();

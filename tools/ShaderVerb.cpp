@@ -184,10 +184,10 @@ void addShaderVerb(CLI::App& command) {
                                                      {"fragment", cg::Stage::FRAGMENT}};
     verb->add_option("FILE", options->file, "Cg source")->required()->type_name("");
     verb->add_option("--entry", options->entry, "Entry function")->required()->type_name("NAME");
-    verb->add_option("--stage", options->stage, "vertex or fragment")
+    verb->add_option("--stage", options->stage, "Stage that it is for")
         ->required()
         ->transform(CLI::CheckedTransformer(stages).description(""))
-        ->type_name("STAGE");
+        ->type_name("vertex|fragment");
     verb->add_option("-D,--define", options->macros, "Macro, as NAME or NAME=TEXT")->type_name("MACRO");
     verb->add_option("-I,--include", options->includeFolders, "Folder to look for includes in")
         ->type_name("DIR");

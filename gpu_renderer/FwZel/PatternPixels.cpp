@@ -394,21 +394,6 @@ uint32_t endOfRun(uint32_t y, uint32_t limit, Test test) {
     return end;
 }
 
-/// The first line after y with another level of the vertical ramp, at most limit.
-uint32_t endOfLevel(const PatternPicture& picture, uint32_t y, uint32_t limit) {
-    const Depth depth = depthOf(picture.bytesPerColour);
-    const uint32_t level = rampTo(y, picture.height, depth);
-    const auto isLevel = [&](uint32_t line) { return rampTo(line, picture.height, depth) == level; };
-    // A division is slow: from where the next level ought to begin, few lines remain to be looked at.
-    const uint64_t next = (uint64_t{level} + 1) * picture.height / depth.max + 1;
-    uint32_t end = std::max(y + 1, static_cast<uint32_t>(std::min<uint64_t>(next, limit)));
-    while (end > y + 1 && !isLevel(end - 1))
-        --end;
-    while (end < limit && isLevel(end))
-        ++end;
-    return end;
-}
-
 } // namespace
 
 PatternPixel patternPixel(const PatternPicture& picture, uint32_t x, uint32_t y) {
@@ -447,8 +432,12 @@ Band bandAt(const PatternPicture& picture, uint32_t y, uint32_t limit) {
         return Band{endOfRun(y, limit, test), isFlat, test(y) ? 1U : 0U};
     };
     switch (picture.pattern) {
-    case VideoTestImage::HV_RAMP:
-        return {endOfLevel(picture, y, limit), false, y};
+    case VideoTestImage::HV_RAMP: {
+        const Depth depth = depthOf(picture.bytesPerColour);
+        const uint32_t level = rampTo(y, picture.height, depth);
+        const auto isLevel = [&](uint32_t line) { return rampTo(line, picture.height, depth) == level; };
+        return {endOfRun(y, limit, isLevel), false, y};
+    }
     case VideoTestImage::COMBI:
         if (y < COMBI_COMPONENT_LINES)
             return {y + 1, false, y};

@@ -15,26 +15,6 @@ using MaybeValues = std::optional<Values>;
 /// Far more than a constant table holds.
 constexpr std::size_t MAX_VALUES = 1 << 20;
 
-double toScalar(double value, Scalar scalar) {
-    switch (scalar) {
-    case Scalar::BOOL:
-        return value != 0 ? 1 : 0;
-    case Scalar::INT:
-        return value >= -2147483648.0 && value <= 2147483647.0
-                   ? static_cast<double>(static_cast<std::int32_t>(value))
-               : value > 0 && value <= 4294967295.0
-                   ? static_cast<double>(static_cast<std::int32_t>(static_cast<std::uint32_t>(value)))
-                   : 0;
-    case Scalar::UINT:
-        return value >= 0 && value <= 4294967295.0 ? static_cast<double>(static_cast<std::uint32_t>(value))
-               : value < 0 && value >= -2147483648.0
-                   ? static_cast<double>(static_cast<std::uint32_t>(static_cast<std::int32_t>(value)))
-                   : 0;
-    default:
-        return static_cast<double>(static_cast<float>(value));
-    }
-}
-
 /// Two's complement arithmetic, without overflow being undefined.
 double integerOperation(BinaryOp op, double left, double right, bool& isValid) {
     const auto a = static_cast<std::int64_t>(left);
@@ -145,7 +125,7 @@ public:
             return std::nullopt;
         switch (expression->kind) {
         case Kind::LITERAL:
-            return Values{toScalar(expression->number, expression->type->scalar)};
+            return Values{valueAs(expression->number, expression->type->scalar)};
         case Kind::VARIABLE:
             return constantVariable(expression->variable);
         case Kind::SWIZZLE:
@@ -356,7 +336,7 @@ private:
 
     static Values rounded(Values values, const Type* type) {
         for (double& value : values)
-            value = toScalar(value, type->scalar);
+            value = valueAs(value, type->scalar);
         return values;
     }
 
@@ -368,6 +348,26 @@ private:
 };
 
 } // namespace
+
+double valueAs(double value, Scalar scalar) {
+    switch (scalar) {
+    case Scalar::BOOL:
+        return value != 0 ? 1 : 0;
+    case Scalar::INT:
+        return value >= -2147483648.0 && value <= 2147483647.0
+                   ? static_cast<double>(static_cast<std::int32_t>(value))
+               : value > 0 && value <= 4294967295.0
+                   ? static_cast<double>(static_cast<std::int32_t>(static_cast<std::uint32_t>(value)))
+                   : 0;
+    case Scalar::UINT:
+        return value >= 0 && value <= 4294967295.0 ? static_cast<double>(static_cast<std::uint32_t>(value))
+               : value < 0 && value >= -2147483648.0
+                   ? static_cast<double>(static_cast<std::uint32_t>(static_cast<std::int32_t>(value)))
+                   : 0;
+    default:
+        return static_cast<double>(static_cast<float>(value));
+    }
+}
 
 std::optional<std::vector<double>> constantValue(const TypedExpr* expression) {
     return Evaluator().evaluate(expression);

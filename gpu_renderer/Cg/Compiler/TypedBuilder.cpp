@@ -353,10 +353,10 @@ TypedExpr* TypedBuilder::withScalar(TypedExpr* expression, Scalar scalar) {
     if (!type->isNumeric() || type->scalar == scalar)
         return expression;
     if (expression->kind == Kind::LITERAL) {
-        const double number = scalar == Scalar::BOOL ? (expression->number != 0 ? 1 : 0)
-                              : isFloating(scalar)   ? expression->number
-                                                     : static_cast<double>(static_cast<long long>(std::clamp(
-                                                           expression->number, -2147483648.0, 4294967295.0)));
+        // A number without a type of its own has no 32 bits to wrap at yet.
+        const double held =
+            expression->isUntyped ? expression->number : valueAs(expression->number, type->scalar);
+        const double number = isFloating(scalar) ? held : valueAs(held, scalar);
         TypedExpr* converted = literal(expression->location, mTypes.scalar(scalar), number);
         converted->isUntyped = expression->isUntyped;
         return converted;
