@@ -24,6 +24,19 @@ constexpr int MAX_CALL_DEPTH = 100;
 constexpr std::size_t MAX_INSTANCES = 64;
 constexpr int MAX_DEFAULT_ARGUMENTS = 4096; ///< in a whole program
 
+/// Functions that give samplers are put in place of their calls, what they choose by as often as they use it.
+constexpr int MAX_SAMPLER_CALLS = 1024; ///< in a whole program
+constexpr int MAX_CHOICE_NODES = 200;   ///< of one argument
+
+/// The nodes of an expression as it is written out; counts no further than the limit.
+int countNodes(const TypedExpr* expression, int limit) {
+    int count = 1;
+    for (const TypedExpr* operand : expression->operands)
+        if (count < limit)
+            count += countNodes(operand, limit - count);
+    return count;
+}
+
 bool isAnyNull(const std::vector<TypedExpr*>& expressions) {
     return std::find(expressions.begin(), expressions.end(), nullptr) != expressions.end();
 }
@@ -478,9 +491,11 @@ TypedExpr* Resolver::defaultArgument(SourceLocation at, const FunctionDecl* decl
 TypedExpr* Resolver::chosenSampler(SourceLocation at, const FunctionDecl* declaration,
                                    const std::vector<TypedExpr*>& arguments) {
     const FunctionDecl* definition = definitionOf(declaration);
-    if (!definition || mCallDepth >= MAX_CALL_DEPTH) {
-        mDiagnostics.error(at, inQuotes(declaration->name) +
-                                   (definition ? " calls itself" : " is declared but not defined"));
+    if (!definition || mCallDepth >= MAX_CALL_DEPTH || ++mSamplerCalls > MAX_SAMPLER_CALLS) {
+        mDiagnostics.error(at, inQuotes(declaration->name) + (!definition ? " is declared but not defined"
+                                                              : mCallDepth >= MAX_CALL_DEPTH
+                                                                  ? " calls itself"
+                                                                  : " gives a sampler too often"));
         return nullptr;
     }
     const std::vector<const Type*> parameters = signatureOf(definition).parameters;
@@ -495,9 +510,11 @@ TypedExpr* Resolver::chosenSampler(SourceLocation at, const FunctionDecl* declar
         variable->alias = mBuild.convert(arguments[i], parameters[i]);
         if (!variable->alias)
             return nullptr;
-        if (hasEffect(variable->alias) || directionOf(parameter) != Direction::IN) {
+        const bool isLong = countNodes(variable->alias, MAX_CHOICE_NODES) >= MAX_CHOICE_NODES;
+        if (isLong || hasEffect(variable->alias) || directionOf(parameter) != Direction::IN) {
             mDiagnostics.error(arguments[i]->location,
-                               "a function that gives a sampler takes only values to choose by");
+                               isLong ? "this is too long to choose a sampler by"
+                                      : "a function that gives a sampler takes only values to choose by");
             return nullptr;
         }
         inner.scope.push_back({parameter->name, variable, nullptr});
@@ -536,7 +553,7 @@ TypedExpr* Resolver::chosenSampler(const FunctionDecl* definition, const std::ve
         TypedExpr* condition = expression(branch->condition);
         std::array<TypedExpr*, 2> values{};
         Stmt* const branches[] = {branch->thenBranch, branch->elseBranch};
-        for (std::size_t i = 0; i < values.size(); ++i)
+        for (std::size_t i = 0; condition && i < values.size() && (i == 0 || values[0]); ++i)
             values[i] = chosenSampler(definition, branches[i] ? after({branches[i]}) : after({}), ways);
         return condition && values[0] && values[1]
                    ? mBuild.conditional(stmt->location, condition, values[0], values[1])

@@ -245,6 +245,7 @@ private:
     Context mContext;
     int mCallDepth = 0;
     int mDefaultArguments = 0;
+    int mSamplerCalls = 0;
 };
 
 } // namespace cg
