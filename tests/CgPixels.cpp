@@ -13,6 +13,7 @@
 #include <filesystem>
 #include <fstream>
 #include <functional>
+#include <initializer_list>
 #include <map>
 #include <sstream>
 #include <string>
@@ -243,7 +244,7 @@ public:
         glColor4f(1, 1, 1, 1);
     }
     ~FixedFunctionState() {
-        for (const GLenum mode : {GL_MODELVIEW, GL_PROJECTION, GL_TEXTURE}) {
+        for (const GLenum mode : std::initializer_list<GLenum>{GL_MODELVIEW, GL_PROJECTION, GL_TEXTURE}) {
             glMatrixMode(mode);
             glLoadIdentity();
         }
@@ -302,7 +303,8 @@ GLuint makeTexture(GLenum target, const TextureSetting& from, bool isLinear) {
     const GLint filter = isLinear ? GL_LINEAR : GL_NEAREST;
     glTexParameteri(target, GL_TEXTURE_MIN_FILTER, filter);
     glTexParameteri(target, GL_TEXTURE_MAG_FILTER, filter);
-    for (const GLenum wrap : {GL_TEXTURE_WRAP_S, GL_TEXTURE_WRAP_T, GL_TEXTURE_WRAP_R})
+    for (const GLenum wrap :
+         std::initializer_list<GLenum>{GL_TEXTURE_WRAP_S, GL_TEXTURE_WRAP_T, GL_TEXTURE_WRAP_R})
         glTexParameteri(target, wrap, GL_CLAMP_TO_EDGE);
     if (from.isDepth)
         glTexParameteri(target, GL_TEXTURE_COMPARE_MODE, GL_COMPARE_REF_TO_TEXTURE);

@@ -16,6 +16,7 @@
 
 #include <array>
 #include <functional>
+#include <initializer_list>
 #include <memory>
 #include <optional>
 
@@ -112,15 +113,16 @@ private:
         glVertexPointer(2, GL_SHORT, 8, nullptr);
         glNormalPointer(GL_SHORT, 8, nullptr);
         glColorPointer(3, GL_UNSIGNED_BYTE, 8, nullptr);
-        for (const GLenum array : {GL_VERTEX_ARRAY, GL_NORMAL_ARRAY, GL_COLOR_ARRAY, GL_TEXTURE_COORD_ARRAY})
+        for (const GLenum array : std::initializer_list<GLenum>{GL_VERTEX_ARRAY, GL_NORMAL_ARRAY,
+                                                                GL_COLOR_ARRAY, GL_TEXTURE_COORD_ARRAY})
             glEnableClientState(array);
         glPrimitiveRestartIndexNV(77);
         glDisableClientState(GL_PRIMITIVE_RESTART_NV);
     }
     static void setFixedFunction() {
-        for (const GLenum capability :
-             {GL_SCISSOR_TEST, GL_DEPTH_TEST, GL_BLEND, GL_CULL_FACE, GL_LINE_SMOOTH, GL_TEXTURE_1D,
-              GL_ALPHA_TEST, GL_NORMALIZE, GL_COLOR_MATERIAL})
+        for (const GLenum capability : std::initializer_list<GLenum>{
+                 GL_SCISSOR_TEST, GL_DEPTH_TEST, GL_BLEND, GL_CULL_FACE, GL_LINE_SMOOTH, GL_TEXTURE_1D,
+                 GL_ALPHA_TEST, GL_NORMALIZE, GL_COLOR_MATERIAL})
             glEnable(capability);
         glDisable(GL_DITHER);
         glViewport(1, 2, 5, 6);
@@ -141,7 +143,7 @@ private:
         glLineWidth(3);
         glPointSize(2);
         glShadeModel(GL_FLAT);
-        for (const GLenum mode : {GL_MODELVIEW, GL_PROJECTION, GL_TEXTURE}) {
+        for (const GLenum mode : std::initializer_list<GLenum>{GL_MODELVIEW, GL_PROJECTION, GL_TEXTURE}) {
             glMatrixMode(mode);
             glLoadIdentity();
             glScalef(0.125F, 0.25F, 0.0625F);
