@@ -31,8 +31,8 @@ inline void addRow(
                                          benchmark::ClobberMemory();
                                      }
                                      if (bytes != 0)
-                                         state.SetBytesProcessed(
-                                             static_cast<int64_t>(state.iterations() * bytes));
+                                         state.SetBytesProcessed(state.iterations() *
+                                                                 static_cast<int64_t>(bytes));
                                  })
         ->UseRealTime()
         ->Unit(benchmark::kMicrosecond);
