@@ -138,6 +138,8 @@ TypedExpr* Resolver::call(const CallExpr* expr) {
         if (type->isStruct())
             return constructStruct(at, type, expr->arguments);
     }
+    if (mFunctionDecls.count(name) != 0)
+        return nullptr; // the error of its own declaration has been said
     std::vector<Name> known = builtinNames();
     for (const auto& entry : mFunctionDecls)
         known.push_back(entry.first);
