@@ -10,7 +10,10 @@ namespace {
 
 /// Stages four floats, or as many of them as the entry has.
 void stageFour(CgParamUnit& unit, const std::array<float, 4>& values) {
-    std::copy_n(values.begin(), std::min<size_t>(values.size(), unit.getTotalSize()), unit.getValue());
+    const size_t count = std::min<size_t>(values.size(), unit.getTotalSize());
+    float* const staged = unit.getValue();
+    for (size_t i = 0; i < count; ++i)
+        staged[i] = values[i];
 }
 
 } // namespace

@@ -1,6 +1,5 @@
 #include <FwZel/CgParamUnit.h>
 
-#include <algorithm>
 #include <utility>
 
 namespace {
@@ -32,8 +31,4 @@ CgParamUnit::CgParamUnit(std::string name, uint32_t type, uint32_t size)
 CgParamUnit::CgParamUnit(std::string name, uint32_t type, uint32_t size, const float* value)
     : CgParamUnit(std::move(name), type, size) {
     setValue(value);
-}
-
-void CgParamUnit::setValue(const float* value) {
-    std::copy_n(value, mValue.size(), mValue.begin());
 }

@@ -37,7 +37,11 @@ public:
 
     /// Stages a value.
     /// @param value  getTotalSize() floats; not checked
-    void setValue(const float* value);
+    void setValue(const float* value) {
+        // A loop: so few floats are copied before the C library has been called.
+        for (float& staged : mValue)
+            staged = *value++;
+    }
 
     std::string getName() const { return mName; }                                  ///< as in the Cg program
     CGparameter getParam() const { return mParam; }                                ///< null until set

@@ -32,6 +32,7 @@ inline constexpr float SINE_BOUND = 6.0F / 16777216.0F;
 /// An estimate of the sine of a phase in radians, from 0 to LAST_ESTIMATED_PHASE.
 inline float estimatedSine(float phase) {
     constexpr float HALF_TURNS_PER_RADIAN = 0.318309886F;
+    constexpr float TO_NEAREST = 0.5F; // a cast cuts
     // The first bits of pi, the next ones, and the rest.
     constexpr float PI_1 = 201.0F / 64.0F;
     constexpr float PI_2 = 1015.0F / 1048576.0F;
@@ -41,7 +42,7 @@ inline float estimatedSine(float phase) {
     constexpr float C7 = -0.000198061622F;
     constexpr float C9 = 2.59904982e-6F;
 
-    const auto halfTurns = static_cast<int32_t>(phase * HALF_TURNS_PER_RADIAN + 0.5F);
+    const auto halfTurns = static_cast<int32_t>(phase * HALF_TURNS_PER_RADIAN + TO_NEAREST);
     const auto turned = static_cast<float>(halfTurns);
     const float r = phase - turned * PI_1 - turned * PI_2 - turned * PI_3;
     const float square = r * r;
