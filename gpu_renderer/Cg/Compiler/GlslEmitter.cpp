@@ -12,8 +12,9 @@ namespace cg {
 
 namespace {
 
-/// `else if` in a row as drivers take them; a software renderer masks no more than some 80 levels.
-constexpr int MAX_CHAIN = 32;
+/// `else if` in a row as drivers take them: each is a level of nesting, and software renderers draw wrongly,
+/// without an error, behind 80 levels or even 32. Half of those are left to what is around and within.
+constexpr int MAX_CHAIN = 16;
 
 using Kind = TypedExpr::Kind;
 
@@ -128,6 +129,14 @@ const TypedStmt* chained(const TypedStmt* stmt) {
     const bool isChained =
         otherwise && otherwise->body.size() == 1 && otherwise->body[0]->kind == TypedStmt::Kind::IF;
     return isChained ? otherwise->body[0] : nullptr;
+}
+
+/// The link of a chain that is one too many to stand in a row with the first; null where there is none.
+const TypedStmt* behindRow(const TypedStmt* first) {
+    const TypedStmt* link = first;
+    for (int links = 0; link && links < MAX_CHAIN; ++links)
+        link = chained(link);
+    return link;
 }
 
 } // namespace
@@ -507,20 +516,36 @@ void GlslEmitter::statement(const TypedStmt* stmt) {
     }
 }
 
-/// An `if` with all its `else if`. Drivers take a chain as one nested within the other, and not any number of
-/// them: what comes behind MAX_CHAIN stands in an `if` of its own.
+/// An `if` with all its `else if`: where they are too many to nest, row by row, each row behind a flag that
+/// none of those before was taken.
 void GlslEmitter::branch(const TypedStmt* stmt) {
-    const TypedStmt* rest = stmt;
-    for (int links = 0; rest && links < MAX_CHAIN; ++links)
-        rest = chained(rest);
-    if (rest) {
-        line("{");
+    const TypedStmt* rest = behindRow(stmt);
+    if (!rest)
+        return row(stmt, nullptr);
+    line("{");
+    ++mIndent;
+    line("bool cg_rest = false;");
+    row(stmt, rest);
+    while (rest) {
+        const TypedStmt* first = rest;
+        rest = behindRow(first);
+        line("if (cg_rest) {");
         ++mIndent;
-        line("bool cg_rest = false;");
+        if (rest)
+            line("cg_rest = false;");
+        row(first, rest);
+        --mIndent;
+        line("}");
     }
-    line("if (" + print(stmt->expression) + ") {");
-    block(stmt->body[0]->body);
-    const TypedStmt* last = stmt;
+    --mIndent;
+    line("}");
+}
+
+/// @param rest  the link that the row stops before and that is left to another; null for a chain's last row
+void GlslEmitter::row(const TypedStmt* first, const TypedStmt* rest) {
+    line("if (" + print(first->expression) + ") {");
+    block(first->body[0]->body);
+    const TypedStmt* last = first;
     for (const TypedStmt* next = chained(last); next != rest; next = chained(last)) {
         line("} else if (" + print(next->expression) + ") {");
         block(next->body[0]->body);
@@ -530,13 +555,6 @@ void GlslEmitter::branch(const TypedStmt* stmt) {
         line("} else {");
         ++mIndent;
         line("cg_rest = true;");
-        --mIndent;
-        line("}");
-        line("if (cg_rest) {");
-        ++mIndent;
-        branch(rest);
-        --mIndent;
-        line("}");
         --mIndent;
     } else if (last->body[1]) {
         line("} else {");
