@@ -2,6 +2,7 @@
 
 #include <FwZel/FieldRows.h>
 #include <FwZel/PictureSize.h>
+#include <FwZel/PpmBytes.h>
 #include <FwZel/RowExpansion.h>
 #include <FwZel/Texture.h>
 #include <FwZel/VideoTestImage.h>
@@ -268,25 +269,25 @@ int getWidthHeightFromPpmFile(std::string fname, uint32_t* width, uint32_t* heig
     return 0;
 }
 
-void fillTextureFromPpmFile(std::string filename, Texture* tex, uint32_t texBufIndex, uint32_t fid,
+size_t fillBytesFromPpmFile(const std::string& fileName, Texture* tex, uint32_t texBufIndex, uint32_t fid,
                             uint32_t shift, bool isFp16) {
     const uint32_t bytesPerColour = tex->getBytesPerColour();
     unsigned char* const rows = tex->getAddress(texBufIndex);
     if (rows == nullptr || (bytesPerColour != 1 && bytesPerColour != 2) || !isBufferLargeEnough(*tex)) {
-        return;
+        return 0;
     }
-    const File file = openFile(filename);
+    const File file = openFile(fileName);
     PPMHeader header;
     if (!file || !isHeaderAccepted(file.get(), &header) || header.width != tex->getWidth() ||
         !isSizeAccepted(header)) {
-        return;
+        return 0;
     }
     const FieldRows field = tex->getIsInterlaced() ? fieldRows(fid) : EVERY_ROW;
     const uint32_t texRows = field.inFile(header.height, tex->getHeight());
     const uint32_t fileRows = texRows == 0 ? 0 : field.first + (texRows - 1) * field.step + 1;
     PixelStream stream(file.get(), uint64_t{fileRows} * header.width);
     if (!stream.hasMemory()) {
-        return;
+        return 0;
     }
     const PixelWriter writer(bytesPerColour, isFp16, shift);
     const size_t pixelBytes = size_t{COMPONENTS} * bytesPerColour;
@@ -303,6 +304,12 @@ void fillTextureFromPpmFile(std::string filename, Texture* tex, uint32_t texBufI
             }
         }
     }
+    return pitch * texRows;
+}
+
+void fillTextureFromPpmFile(std::string filename, Texture* tex, uint32_t texBufIndex, uint32_t fid,
+                            uint32_t shift, bool isFp16) {
+    fillBytesFromPpmFile(filename, tex, texBufIndex, fid, shift, isFp16);
 }
 
 std::string refusalOfPpmFile(const std::string& fileName) {

@@ -1,6 +1,8 @@
 #include <FwZel/Texture.h>
 
+#include <FwZel/PictureFormat.h>
 #include <FwZel/PictureSize.h>
+#include <FwZel/PpmBytes.h>
 #include <FwZel/VideoTestImage.h>
 #include <FwZel/kxsys_syslog.h>
 
@@ -36,15 +38,27 @@ GLenum mappingTarget(bool isWriteAccess) {
     return isWriteAccess ? GL_PIXEL_UNPACK_BUFFER : GL_PIXEL_PACK_BUFFER;
 }
 
-/// Asks for huge pages, where the system gives them on request: the first fill of a fresh buffer otherwise
-/// spends most of its time in page faults. A request that fails changes nothing.
-void adviseHugePages(void* buffer, uint32_t bytes) {
+/// Gets the memory of a fresh buffer: in huge pages, where the system gives them on request, and what lies
+/// before and after them in one call each. The first fill would otherwise spend most of its time in page
+/// faults. A request that fails changes nothing.
+void populate(void* buffer, uint32_t bytes) {
+    constexpr uintptr_t PAGE = 4096;
     constexpr uintptr_t HUGE_PAGE = uintptr_t{2} << 20;
+    const auto up = [](uintptr_t address, uintptr_t page) { return (address + page - 1) & ~(page - 1); };
+    const auto down = [](uintptr_t address, uintptr_t page) { return address & ~(page - 1); };
+    const auto advise = [](uintptr_t begin, uintptr_t end, int advice) {
+        if (begin < end)
+            madvise(reinterpret_cast<void*>(begin), end - begin, advice);
+    };
     const auto start = reinterpret_cast<uintptr_t>(buffer);
-    const uintptr_t begin = (start + HUGE_PAGE - 1) & ~(HUGE_PAGE - 1);
-    const uintptr_t end = (start + bytes) & ~(HUGE_PAGE - 1);
-    if (begin < end)
-        madvise(reinterpret_cast<void*>(begin), end - begin, MADV_HUGEPAGE);
+    const uintptr_t end = start + bytes;
+    const uintptr_t hugeStart = up(start, HUGE_PAGE);
+    const uintptr_t hugeEnd = down(end, HUGE_PAGE);
+    if (hugeStart >= hugeEnd)
+        return;
+    advise(hugeStart, hugeEnd, MADV_HUGEPAGE);
+    advise(up(start, PAGE), hugeStart, MADV_POPULATE_WRITE);
+    advise(hugeEnd, down(end, PAGE), MADV_POPULATE_WRITE);
 }
 
 void createBuffer(GLenum target, uint32_t& name, uint32_t size, GLenum usage) {
@@ -172,7 +186,7 @@ void Texture::createTextureForTestPattern() {
             if (fillFitsHostBuf(mIsFp16 ? 2 : 1))
                 VideoTestImage::fillTexturePattern(this, mTestPattern, i, fieldOfBuffer(i), mIsFp16);
             else
-                clearHostBuf(i);
+                clearHostBuf(i, 0);
         }
         createGLBufObjects(i);
     }
@@ -182,14 +196,24 @@ void Texture::createTextureForFile() {
     resizeBuffers(static_cast<int>(mNumBuffers));
     for (uint32_t i = 0; i < mNumBuffers; ++i) {
         allocHostBufs(i);
-        if (mHostBufPtrs[i]) {
-            // First, so that rows which a damaged file does not deliver hold no stale memory.
-            clearHostBuf(i);
-            if (fillFitsHostBuf(mNumBytesPerColour))
-                VideoTestImage::fillTextureFile(mFileName, this, i, fieldOfBuffer(i), 0, mIsFp16);
-        }
+        if (mHostBufPtrs[i])
+            fillHostBufFromFile(i);
         createGLBufObjects(i);
     }
+}
+
+/// What the file does not deliver holds no stale memory. A PPM file fills the buffer from its start, so only
+/// the rest is cleared; a PNG file may stop in the middle of a pass over the picture.
+void Texture::fillHostBufFromFile(uint32_t buf_num) {
+    const bool isFillable = fillFitsHostBuf(mNumBytesPerColour);
+    const bool isFilledFromStart = pictureFormat(mFileName) == PictureFormat::PPM;
+    const uint32_t field = fieldOfBuffer(buf_num);
+    size_t filled = 0;
+    if (isFillable && isFilledFromStart)
+        filled = fillBytesFromPpmFile(mFileName, this, buf_num, field, 0, mIsFp16);
+    clearHostBuf(buf_num, filled);
+    if (isFillable && !isFilledFromStart)
+        VideoTestImage::fillTextureFile(mFileName, this, buf_num, field, 0, mIsFp16);
 }
 
 uint32_t Texture::fieldOfBuffer(uint32_t buf_num) const {
@@ -238,11 +262,11 @@ void Texture::allocHostBufs(uint32_t fid) {
                      static_cast<int>(fid));
         return;
     }
-    adviseHugePages(mHostBufPtrs[fid], hostBufBytes());
+    populate(mHostBufPtrs[fid], hostBufBytes());
 }
 
-void Texture::clearHostBuf(uint32_t buf_num) {
-    std::memset(mHostBufPtrs[buf_num], 0, hostBufBytes());
+void Texture::clearHostBuf(uint32_t buf_num, size_t from) {
+    std::memset(static_cast<unsigned char*>(mHostBufPtrs[buf_num]) + from, 0, hostBufBytes() - from);
 }
 
 bool Texture::fillFitsHostBuf(uint32_t bytesPerElement) {

@@ -5,6 +5,7 @@
 
 #include <boost/thread/mutex.hpp>
 
+#include <cstddef>
 #include <cstdint>
 #include <string>
 #include <vector>
@@ -257,7 +258,8 @@ private:
     void resizeBuffers(int num_buf);
     uint32_t fieldOfBuffer(uint32_t buf_num) const;
     void allocHostBufs(uint32_t fid);
-    void clearHostBuf(uint32_t buf_num);
+    void clearHostBuf(uint32_t buf_num, size_t from);
+    void fillHostBufFromFile(uint32_t buf_num);
     bool fillFitsHostBuf(uint32_t bytesPerElement);
     void createGLBufObjects(uint32_t fid);
     void createGLTex(uint32_t buf_num);
