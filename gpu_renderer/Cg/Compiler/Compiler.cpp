@@ -2,6 +2,7 @@
 
 #include <Cg/Compiler/Arena.h>
 #include <Cg/Compiler/Diagnostics.h>
+#include <Cg/Compiler/FlatBranches.h>
 #include <Cg/Compiler/GlslEmitter.h>
 #include <Cg/Compiler/ParameterList.h>
 #include <Cg/Compiler/Parser.h>
@@ -57,7 +58,7 @@ void translate(const CompileRequest& request, SourceFiles& files, Diagnostics& d
     TypeTable types(arena);
     std::set<Name> plainSamplers;
     std::size_t known = 0;
-    const TypedProgram* program = nullptr;
+    TypedProgram* program = nullptr;
     do {
         known = plainSamplers.size();
         program =
@@ -70,6 +71,7 @@ void translate(const CompileRequest& request, SourceFiles& files, Diagnostics& d
                                    request.varyingPlaces ? *request.varyingPlaces : ownPlaces);
     if (!checkInterface(interface, diagnostics))
         return;
+    flattenBranches(*program, types, arena);
     const References references(*program);
     GlslEmitter emitter(*program, types, interface, references);
     result.glsl = emitter.emit();

@@ -12,10 +12,6 @@ namespace cg {
 
 namespace {
 
-/// `else if` in a row as drivers take them: each is a level of nesting, and software renderers draw wrongly,
-/// without an error, behind 80 levels or even 32. Half of those are left to what is around and within.
-constexpr int MAX_CHAIN = 16;
-
 using Kind = TypedExpr::Kind;
 
 /// How strongly GLSL's operators bind.
@@ -129,14 +125,6 @@ const TypedStmt* chained(const TypedStmt* stmt) {
     const bool isChained =
         otherwise && otherwise->body.size() == 1 && otherwise->body[0]->kind == TypedStmt::Kind::IF;
     return isChained ? otherwise->body[0] : nullptr;
-}
-
-/// The link of a chain that is one too many to stand in a row with the first; null where there is none.
-const TypedStmt* behindRow(const TypedStmt* first) {
-    const TypedStmt* link = first;
-    for (int links = 0; link && links < MAX_CHAIN; ++links)
-        link = chained(link);
-    return link;
 }
 
 } // namespace
@@ -516,47 +504,17 @@ void GlslEmitter::statement(const TypedStmt* stmt) {
     }
 }
 
-/// An `if` with all its `else if`: where they are too many to nest, row by row, each row behind a flag that
-/// none of those before was taken.
+/// An `if` with all its `else if`.
 void GlslEmitter::branch(const TypedStmt* stmt) {
-    const TypedStmt* rest = behindRow(stmt);
-    if (!rest)
-        return row(stmt, nullptr);
-    line("{");
-    ++mIndent;
-    line("bool cg_rest = false;");
-    row(stmt, rest);
-    while (rest) {
-        const TypedStmt* first = rest;
-        rest = behindRow(first);
-        line("if (cg_rest) {");
-        ++mIndent;
-        if (rest)
-            line("cg_rest = false;");
-        row(first, rest);
-        --mIndent;
-        line("}");
-    }
-    --mIndent;
-    line("}");
-}
-
-/// @param rest  the link that the row stops before and that is left to another; null for a chain's last row
-void GlslEmitter::row(const TypedStmt* first, const TypedStmt* rest) {
-    line("if (" + print(first->expression) + ") {");
-    block(first->body[0]->body);
-    const TypedStmt* last = first;
-    for (const TypedStmt* next = chained(last); next != rest; next = chained(last)) {
+    line("if (" + print(stmt->expression) + ") {");
+    block(stmt->body[0]->body);
+    const TypedStmt* last = stmt;
+    for (const TypedStmt* next = chained(last); next; next = chained(last)) {
         line("} else if (" + print(next->expression) + ") {");
         block(next->body[0]->body);
         last = next;
     }
-    if (rest) {
-        line("} else {");
-        ++mIndent;
-        line("cg_rest = true;");
-        --mIndent;
-    } else if (last->body[1]) {
+    if (last->body[1]) {
         line("} else {");
         block(last->body[1]->body);
     }

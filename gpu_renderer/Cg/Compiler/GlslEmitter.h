@@ -41,7 +41,6 @@ private:
     void statement(const TypedStmt* stmt);
     void block(const std::vector<TypedStmt*>& body);
     void branch(const TypedStmt* stmt);
-    void row(const TypedStmt* first, const TypedStmt* rest);
     void declaration(const TypedStmt* stmt);
     void forLoop(const TypedStmt* stmt);
     std::string forInitializer(const TypedStmt* stmt);
