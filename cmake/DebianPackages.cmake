@@ -1,5 +1,6 @@
 # Debian packages, one a component:
 #
+#     scripts/install-packages package    # as root, where they are missing
 #     cmake --preset package && cmake --build --preset package && (cd build/package && cpack)
 #
 # The packages are for the Debian that they are built on: dpkg-shlibdeps names the libraries they need.
@@ -40,6 +41,9 @@ endfunction()
 
 fwzel_package(runtime libfwzel1 libs "rendering support library for broadcast video graphics"
   "This package holds the shared libraries.")
+# libepoxy loads OpenGL and EGL when they are first called; what only computes does without.
+set(opengl "libegl1, libgl1")
+set(CPACK_DEBIAN_RUNTIME_PACKAGE_RECOMMENDS ${opengl})
 set(CPACK_DEBIAN_PACKAGE_GENERATE_SHLIBS ON)
 set(CPACK_DEBIAN_PACKAGE_GENERATE_SHLIBS_POLICY >=)
 set(CPACK_DEBIAN_RUNTIME_PACKAGE_CONTROL_EXTRA ${CMAKE_CURRENT_LIST_DIR}/debian/triggers)
@@ -50,11 +54,10 @@ set(CPACK_DEBIAN_DEVELOPMENT_PACKAGE_SHLIBDEPS OFF)
 set(CPACK_DEBIAN_DEVELOPMENT_PACKAGE_DEPENDS "libfwzel1 (= ${PROJECT_VERSION}), libboost-dev")
 set(CPACK_DEBIAN_DEVELOPMENT_PACKAGE_SUGGESTS fwzel-doc)
 
-# libepoxy loads OpenGL and EGL when they are first called; verbs that only compute do without.
 fwzel_package(tools fwzel-tools graphics "test patterns and pictures on the command line"
   "This package holds the command fwzel.")
 set(CPACK_DEBIAN_TOOLS_PACKAGE_DEPENDS "libfwzel1 (= ${PROJECT_VERSION})")
-set(CPACK_DEBIAN_TOOLS_PACKAGE_RECOMMENDS "libegl1, libgl1")
+set(CPACK_DEBIAN_TOOLS_PACKAGE_RECOMMENDS ${opengl})
 
 fwzel_package(documentation fwzel-doc doc "rendering support library for broadcast video graphics - documents"
   "This package holds the documents and an example.")

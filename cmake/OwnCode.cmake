@@ -13,7 +13,7 @@ function(own_code target)
   endif()
 endfunction()
 
-# hardened(target): what is loaded into a process on air.
+# hardened(target): what is loaded into a process on air, or installed.
 #
 # A smashed stack, a C library call past the end of an array and a jump to where no function starts end the
 # process instead of going on, and what the loader has resolved cannot be written any more. _FORTIFY_SOURCE needs
