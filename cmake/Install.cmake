@@ -22,8 +22,11 @@ install(FILES
   ${PROJECT_BINARY_DIR}/cmake/FwZelConfigVersion.cmake
   DESTINATION ${package_folder} COMPONENT development)
 
-# The .pc files find the prefix from where they lie, so that --prefix may differ from the configured one.
+# The .pc files find the prefix from where they lie, so that --prefix may differ from the configured one. The folders
+# may be configured as absolute paths.
 file(RELATIVE_PATH prefix_from_pc ${CMAKE_INSTALL_FULL_LIBDIR}/pkgconfig ${CMAKE_INSTALL_PREFIX})
+file(RELATIVE_PATH libdir_from_prefix ${CMAKE_INSTALL_PREFIX} ${CMAKE_INSTALL_FULL_LIBDIR})
+file(RELATIVE_PATH includedir_from_prefix ${CMAKE_INSTALL_PREFIX} ${CMAKE_INSTALL_FULL_INCLUDEDIR})
 foreach(pc fwzel fwzel-cg)
   configure_file(cmake/${pc}.pc.in ${PROJECT_BINARY_DIR}/cmake/${pc}.pc @ONLY)
   install(FILES ${PROJECT_BINARY_DIR}/cmake/${pc}.pc
@@ -37,8 +40,9 @@ install(FILES tools/completion.bash RENAME fwzel
   DESTINATION ${CMAKE_INSTALL_DATADIR}/bash-completion/completions COMPONENT tools)
 
 set(doc_folder ${CMAKE_INSTALL_DATAROOTDIR}/doc/fwzel)
-install(FILES README.md DESTINATION ${doc_folder} COMPONENT documentation)
+install(FILES README.md CHANGELOG.md CONTRIBUTING.md SECURITY.md DESTINATION ${doc_folder} COMPONENT documentation)
 install(DIRECTORY docs DESTINATION ${doc_folder} COMPONENT documentation
   PATTERN man EXCLUDE
-  PATTERN CMakeLists.txt EXCLUDE)
+  PATTERN CMakeLists.txt EXCLUDE
+  PATTERN reference.md EXCLUDE)
 install(DIRECTORY examples/installed DESTINATION ${doc_folder}/examples COMPONENT documentation)
