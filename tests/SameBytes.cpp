@@ -1,4 +1,5 @@
 #include <FwZel/RowExpansion.h>
+#include <FwZel/TestPatternCatalogue.h>
 #include <FwZel/VideoTestImage.h>
 
 #include <cstdint>
@@ -6,8 +7,8 @@
 #include <numeric>
 #include <vector>
 
-// Prints a digest for each pattern, the colour fills and each expansion of file rows, for tests/same-bytes to
-// compare between compilers and their options.
+// Prints a digest for each pattern, the colour fills and each expansion of file rows, for scripts/same-bytes
+// to compare between compilers and their options.
 
 namespace {
 
@@ -107,7 +108,7 @@ void printExpansion(const RowExpansion& expansion) {
 } // namespace
 
 int main() {
-    for (uint32_t pattern = 0; pattern < 23; ++pattern) {
+    for (uint32_t pattern = 0; pattern <= NUM_TEST_PATTERNS; ++pattern) { // and one that is none
         Digest digest;
         for (const Size& size : SIZES)
             for (const uint32_t field : {0U, 1U, 2U}) {
