@@ -14,7 +14,10 @@ namespace {
 
 using host::GlFeature;
 
-/// What a context of Mesa's lacks for everything that a host can do.
+const std::string NO_CONTEXT = "no context: ";
+
+/// What a context of Mesa's lacks for everything that a host can do; NO_CONTEXT and the reason where there is
+/// none.
 /// @param version  OpenGL version that it claims, null for its own
 /// @param without  extensions that are taken away
 std::string missingWith(const char* version, const std::string& without) {
@@ -36,7 +39,7 @@ std::string missingWith(const char* version, const std::string& without) {
                  GlFeature::READBACK_BUFFERS, GlFeature::HALF_FLOATS, GlFeature::FRAMEBUFFER_BLIT,
                  GlFeature::VERTEX_LISTS, GlFeature::STRIPS, GlFeature::CG_PROGRAMS});
         } catch (const std::runtime_error& error) {
-            missing = error.what();
+            missing = NO_CONTEXT + error.what();
         }
         _exit(write(ends[1], missing.data(), missing.size()) < 0 ? 1 : 0);
     }
@@ -54,8 +57,10 @@ std::string missingWith(const char* version, const std::string& without) {
 // Mesa lowers its version with an extension that the version demands; those that it cannot do without itself
 // go all together.
 TEST(GlRequirements, EveryNeedThatIsNotMetIsNamed) {
-    if (!missingWith(nullptr, "").empty())
-        GTEST_SKIP() << missingWith(nullptr, "");
+    const std::string missing = missingWith(nullptr, "");
+    if (missing.rfind(NO_CONTEXT, 0) == 0 && !std::getenv("CI"))
+        GTEST_SKIP() << missing;
+    ASSERT_EQ(missing, "");
     const std::string glsl = "shaders of GLSL 3.30 (OpenGL 3.3)";
     const std::string framebuffers = "framebuffers and mip maps (GL_EXT_framebuffer_object)";
     const std::string uploads = "upload through pixel buffers (GL_ARB_pixel_buffer_object or OpenGL 2.1)";

@@ -35,8 +35,9 @@ Result orEnd(Result result) {
 } // namespace
 
 int main(int argc, char** argv) {
-    // RTLD_NOW: a library whose log function is nowhere is refused here, not at its first message.
-    void* const library = orEnd(dlopen(argc > 1 ? argv[1] : "libFwZel.so.1", RTLD_NOW));
+    // RTLD_LAZY: the library itself asks that a missing log function is noticed here, not at its first
+    // message.
+    void* const library = orEnd(dlopen(argc > 1 ? argv[1] : "libFwZel.so.1", RTLD_LAZY));
     const auto construct = reinterpret_cast<void (*)(void*)>(orEnd(dlsym(library, "_ZN10CgResourceC1Ev")));
     const auto typeOf = reinterpret_cast<uint32_t (*)(const void*, std::string)>(orEnd(
         dlsym(library,

@@ -148,6 +148,7 @@ private:
 TEST(LongRun, MemoryAndDescriptorsStayWhatTheyAreAfterWarmUp) {
     const char* const asked = std::getenv("FWZEL_TEST_FRAMES");
     const int frames = asked ? std::atoi(asked) : 2000;
+    ASSERT_GE(frames, 400) << "FWZEL_TEST_FRAMES: a number of frames of which the first quarter is a warm-up";
     std::optional<host::HeadlessSurface> surface;
     try {
         surface.emplace(16U, 16U);
