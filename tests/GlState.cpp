@@ -2,6 +2,7 @@
 #include <fixture/GlState.h>
 #include <fixture/GlTest.h>
 #include <fixture/PictureFiles.h>
+#include <fixture/SwappedEntryPoint.h>
 
 #include <Cg/cgGL.h>
 #include <FwZel/FWDebugFont.h>
@@ -273,11 +274,67 @@ Texture::TexArgs textureArgs(uint32_t access, bool isPbo = true) {
     return args;
 }
 
+GLuint boundAt(GLenum query) {
+    GLint bound = 0;
+    glGetIntegerv(query, &bound);
+    return static_cast<GLuint>(bound);
+}
+
 /// Where an operation expects nothing of it.
 void bindUnpackBuffer() {
-    GLint buffer = 0;
-    glGetIntegerv(GL_ARRAY_BUFFER_BINDING, &buffer);
-    glBindBuffer(GL_PIXEL_UNPACK_BUFFER, static_cast<GLuint>(buffer));
+    glBindBuffer(GL_PIXEL_UNPACK_BUFFER, boundAt(GL_ARRAY_BUFFER_BINDING));
+}
+
+/// The one message since the last call, which an operation that refused or failed has left.
+void expectMessage(const char* text) {
+    const std::vector<LogMessage> log = takeLog();
+    ASSERT_EQ(log.size(), 1U) << text;
+    EXPECT_NE(log.front().text.find(text), std::string::npos) << log.front();
+}
+
+TEST_F(GlStateTest, TexturesThatFailOrRefuseChangeWhatIsDocumented) {
+    Texture plain(VideoTestImage::COMBI, textureArgs(GL_WRITE_ONLY, false));
+    Texture upload(VideoTestImage::COMBI, textureArgs(GL_WRITE_ONLY));
+    Texture readback(VideoTestImage::COMBI, textureArgs(GL_READ_ONLY));
+    const Changes uploadBound = {{"PIXEL_UNPACK_BUFFER_BINDING", {static_cast<double>(upload.getPboID(0))}}};
+    const Changes readbackBound = {
+        {"PIXEL_PACK_BUFFER_BINDING", {static_cast<double>(readback.getPboID(0))}}};
+    const auto mapInVain = [](Texture& texture) {
+        const SwappedEntryPoint map(
+            "glMapBuffer", epoxy_glMapBuffer, +[](GLenum, GLenum) -> void* { return nullptr; });
+        texture.mapPbo(0);
+        expectMessage("GPUR 457");
+    };
+    const auto unmapInVain = [](Texture& texture) {
+        const SwappedEntryPoint unmap(
+            "glUnmapBuffer", epoxy_glUnmapBuffer, +[](GLenum) -> GLboolean { return GL_FALSE; });
+        texture.unmapPbo(0);
+        expectMessage("GPUR 460");
+    };
+    const auto refused = [](const char* message, auto operation) {
+        return [=] {
+            operation();
+            expectMessage(message);
+        };
+    };
+    compare({
+        {"mapPbo, upload", [&] { mapInVain(upload); }, uploadBound + UNPACK_ALIGNED},
+        {"mapPbo, readback", [&] { mapInVain(readback); }, readbackBound + PACK_ALIGNED},
+        {"unmapPbo, upload, not mapped", refused("GPUR 458", [&] { upload.unmapPbo(0); }), NOTHING,
+         bindUnpackBuffer},
+        {"unmapPbo, readback, not mapped", refused("GPUR 459", [&] { readback.unmapPbo(0); }), NOTHING},
+        {"unmapPbo, upload", [&] { unmapInVain(upload); }, uploadBound, [&] { upload.mapPbo(0); }},
+        {"unmapPbo, readback", [&] { unmapInVain(readback); }, readbackBound, [&] { readback.mapPbo(0); }},
+        {"copyPBOToGLTex", refused("GPUR 456", [&] { plain.copyPBOToGLTex(0); }), NOTHING, bindUnpackBuffer},
+        {"copyPBOToGLTex, two", refused("GPUR 454", [&] { plain.copyPBOToGLTex(0, 0); }), NOTHING,
+         bindUnpackBuffer},
+        {"copyHostBufToPBO", refused("GPUR 455", [&] { plain.copyHostBufToPBO(0, 0); }), NOTHING,
+         bindUnpackBuffer},
+        {"copyHostBufToPBO, readback", refused("for readback", [&] { readback.copyHostBufToPBO(0); }),
+         NOTHING, bindUnpackBuffer},
+        {"readbackGLTexToPBO", refused("No readback PBO", [&] { upload.readbackGLTexToPBO(0); }), NOTHING},
+        {"readbackPBOToHostBuf", refused("for upload", [&] { upload.readbackPBOToHostBuf(0); }), NOTHING},
+    });
 }
 
 TEST_F(GlStateTest, TexturesChangeWhatTheyDocument) {
@@ -337,10 +394,10 @@ TEST_F(GlStateTest, TexturesChangeWhatTheyDocument) {
     });
 }
 
-/// A host's own shape: a strip.
-class Strip : public VertexList {
+/// A host's own shape.
+class OwnShape : public VertexList {
 public:
-    Strip() : VertexList(nullptr, GL_TRIANGLE_STRIP) {
+    explicit OwnShape(GLenum primitive) : VertexList(nullptr, primitive) {
         GLuint buffers[2] = {};
         glGenBuffers(2, buffers);
         mVertexDataBufferID = buffers[0];
@@ -361,7 +418,13 @@ TEST_F(GlStateTest, ShapesChangeWhatTheyDocument) {
     std::unique_ptr<VertexListPlane> plane;
     std::unique_ptr<VertexListBox> box;
     std::unique_ptr<VertexListLines> lines;
-    Strip strip;
+    OwnShape strip(GL_TRIANGLE_STRIP);
+    OwnShape polygon(GL_POLYGON);
+    glPrimitiveRestartIndexNV(0xFFFFFFFF); // for the number that this driver gives for it, -1 perhaps
+    const Changes restarting = {{"PRIMITIVE_RESTART_NV", {1}},
+                                {"PRIMITIVE_RESTART_INDEX_NV", glState().at("PRIMITIVE_RESTART_INDEX_NV")},
+                                {"PRIMITIVE_RESTART", ANYTHING},
+                                {"PRIMITIVE_RESTART_INDEX", ANYTHING}};
     compare({
         {"plane, constructor", [&] { plane = std::make_unique<VertexListPlane>(3U, 2U, 0.5F, nullptr); },
          SHAPE_UNBOUND},
@@ -386,11 +449,8 @@ TEST_F(GlStateTest, ShapesChangeWhatTheyDocument) {
         {"plane, render", [&] { plane->render(); }, RENDERED},
         {"box, render", [&] { box->render(); }, RENDERED + Changes{{"LINE_WIDTH", {1}}}},
         {"polyline, render", [&] { lines->render(); }, RENDERED + Changes{{"LINE_WIDTH", {2}}}},
-        {"strip, render", [&] { strip.render(); },
-         RENDERED + Changes{{"PRIMITIVE_RESTART_NV", {1}},
-                            {"PRIMITIVE_RESTART_INDEX_NV", ANYTHING},
-                            {"PRIMITIVE_RESTART", ANYTHING},
-                            {"PRIMITIVE_RESTART_INDEX", ANYTHING}}},
+        {"strip, render", [&] { strip.render(); }, RENDERED + restarting},
+        {"polygon, render", [&] { polygon.render(); }, RENDERED + restarting},
         {"base without buffers", [] { VertexList(nullptr, GL_TRIANGLES).render(); }, NOTHING},
         {"setColor", [] { FWDebugFont::setColor(1, 0, 0, 1); }, {{"CURRENT_COLOR", {1, 0, 0, 1}}}},
         {"setPos",
@@ -418,6 +478,7 @@ TEST_F(GlStateTest, ProgramsChangeWhatTheyDocument) {
                 "{ return mul(m, float4(gain, 1)) * tex2D(picture, place); }\n"));
     constexpr int SAMPLERS_UNIT = 5;
     std::unique_ptr<Shader> shader;
+    CGcontext context = nullptr;
     GLuint picture = 0;
     glGenTextures(1, &picture);
     const Changes pipelineBound = {{"PROGRAM_PIPELINE_BINDING", ANYTHING}};
@@ -460,6 +521,16 @@ TEST_F(GlStateTest, ProgramsChangeWhatTheyDocument) {
          textureAt(SAMPLERS_UNIT, picture) + pipelineBound},
         {"cgDestroyProgram", [&] { cgDestroyProgram(shader->mCgProgram); }, pipelineUnbound, withoutProgram},
         {"destructor", [&] { shader.reset(); }, NOTHING},
+        {"cgDestroyContext", [&] { cgDestroyContext(context); }, pipelineUnbound,
+         [&] {
+             context = cgCreateContext();
+             const CGprogram program = cgCreateProgramFromFile(context, CG_SOURCE, file.path().c_str(),
+                                                               CG_PROFILE_GLSLF, "Cg_Main", nullptr);
+             cgGLLoadProgram(program);
+             cgGLBindProgram(program);
+             EXPECT_NE(boundAt(GL_PROGRAM_PIPELINE_BINDING), 0U);
+             withoutProgram();
+         }},
     });
     manage(CG_FALSE);
     cgGLDisableProfile(CG_PROFILE_GLSLF);
