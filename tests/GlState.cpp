@@ -524,8 +524,8 @@ TEST_F(GlStateTest, ProgramsChangeWhatTheyDocument) {
         {"cgDestroyContext", [&] { cgDestroyContext(context); }, pipelineUnbound,
          [&] {
              context = cgCreateContext();
-             const CGprogram program = cgCreateProgramFromFile(context, CG_SOURCE, file.path().c_str(),
-                                                               CG_PROFILE_GLSLF, "Cg_Main", nullptr);
+             CGprogram program = cgCreateProgramFromFile(context, CG_SOURCE, file.path().c_str(),
+                                                         CG_PROFILE_GLSLF, "Cg_Main", nullptr);
              cgGLLoadProgram(program);
              cgGLBindProgram(program);
              EXPECT_NE(boundAt(GL_PROGRAM_PIPELINE_BINDING), 0U);
