@@ -7,6 +7,8 @@
 #include <cstdio>
 #include <fstream>
 #include <functional>
+#include <random>
+#include <set>
 #include <string>
 #include <vector>
 
@@ -564,6 +566,51 @@ TEST_F(CgRuntime, AStageWithoutAProgramIsFixedFunction) {
     EXPECT_EQ(canvas.drawnPixel(), fixed) << "destroyed";
     EXPECT_EQ(stateOf(GL_PROGRAM_PIPELINE_BINDING), 0);
     glColor4f(1, 1, 1, 1);
+}
+
+TEST_F(CgRuntime, ThePairsOfAProcessMayHaveAnyNumberOfVaryingNames) {
+    constexpr unsigned POOL = 60; // three times as many as OpenGL has locations for
+    std::mt19937 random(1);
+    FloatCanvas canvas(1, 1);
+    for (int pair = 0; pair < 30 && !HasFailure(); ++pair) {
+        std::set<unsigned> names;
+        for (const size_t count = 3 + random() % 5; names.size() < count;)
+            names.insert(static_cast<unsigned>(random() % POOL));
+        // Each stage has names that the other lacks; what both have comes through.
+        std::string outputs, writes, inputs, sum;
+        Pixel expected{};
+        for (const unsigned name : names) {
+            const std::string text = std::to_string(name);
+            const std::string parameter = "float4 v" + text + " : OWN_" + text + '_';
+            const bool isRead = name == *names.begin() || random() % 4 != 0;
+            const float weight = static_cast<float>(1 + random() % 8);
+            outputs += ", out " + parameter;
+            writes += "    v" + text + " = float4(" + text + ", 1, 0, " + std::to_string(pair) + ");\n";
+            if (!isRead)
+                continue;
+            inputs += parameter + ", ";
+            sum += " + " + std::to_string(weight) + " * v" + text;
+            const Pixel written = {static_cast<float>(name), 1, 0, static_cast<float>(pair)};
+            for (size_t i = 0; i < 4; ++i)
+                expected[i] += weight * written[i];
+        }
+        const std::string lacking = std::to_string(random() % POOL + POOL);
+        const std::string source = "void vertex(inout float4 position : POSITION" + outputs + ")\n{\n" +
+                                   writes + "}\nfloat4 fragment(" + inputs + "float4 lacking : OWN_" +
+                                   lacking + "_, uniform bool isShown = false) : COLOR\n{\n" +
+                                   "    return isShown ? lacking : float4(0)" + sum + ";\n}\n";
+        const bool isFragmentFirst = random() % 2 != 0;
+        for (const bool isFragment : {isFragmentFirst, !isFragmentFirst}) {
+            const CGprofile profile = isFragment ? CG_PROFILE_GLSLF : CG_PROFILE_GLSLV;
+            CGprogram program = cgCreateProgram(mContext, CG_SOURCE, source.c_str(), profile,
+                                                isFragment ? "fragment" : "vertex", nullptr);
+            ASSERT_TRUE(program) << "pair " << pair << ":\n" << cgGetLastListing(mContext) << source;
+            cgGLLoadProgram(program);
+            cgGLBindProgram(program);
+            cgGLEnableProfile(profile);
+        }
+        EXPECT_EQ(canvas.drawnPixel(), expected) << "pair " << pair << ":\n" << source;
+    }
 }
 
 TEST_F(CgRuntime, TheHostsProgramAndActiveUnitStay) {

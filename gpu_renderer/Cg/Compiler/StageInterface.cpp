@@ -2,7 +2,6 @@
 
 #include <algorithm>
 #include <cctype>
-#include <optional>
 #include <set>
 
 namespace cg {
@@ -230,30 +229,22 @@ void StageInterface::declareAttributes(const std::map<std::string, const StageVa
     }
 }
 
-/// Names that have a place come first: the others go where there is room.
 void StageInterface::declareVaryings(const std::map<std::string, const StageValue*>& values,
                                      VaryingPlaces& places) {
     const bool isOutput = mStage == Stage::VERTEX;
-    std::map<std::string, int> locations;
-    std::set<int> taken;
-    const auto declare = [&](const std::string& name, std::optional<int> place) {
-        const bool isNew = place && taken.insert(*place).second;
-        locations[name] = FIRST_PLACE_LOCATION + place.value_or(0);
-        if (!isNew && !mUnplaced)
-            mUnplaced = values.at(name);
-    };
-    for (const auto& [name, value] : values) {
-        const int location = fixedLocation(split(value->semantic));
-        if (location != NO_LOCATION)
-            locations[name] = location;
-        else if (const std::optional<int> place = places.find(name))
-            declare(name, place);
-    }
+    std::set<std::string> ownNames;
     for (const auto& [name, value] : values)
-        if (locations.count(name) == 0)
-            declare(name, places.add(name, taken));
-    for (const auto& [name, location] : locations)
+        if (fixedLocation(split(value->semantic)) == NO_LOCATION)
+            ownNames.insert(name);
+    const std::map<std::string, int> placed = places.assign(ownNames);
+    for (const auto& [name, value] : values) {
+        const auto own = placed.find(name);
+        const int location =
+            own == placed.end() ? fixedLocation(split(value->semantic)) : FIRST_PLACE_LOCATION + own->second;
+        if (location == NO_LOCATION && !mUnplaced)
+            mUnplaced = value;
         mDeclarations.push_back({name, location, isOutput});
+    }
 }
 
 StageSlot StageInterface::slot(const StageValue& value) const {

@@ -32,10 +32,10 @@ struct StageDeclaration {
 class StageInterface {
 public:
     /// @param values  all inputs and outputs of the stage
-    /// @param places  takes in the varyings that it does not know
+    /// @param places  gives the varyings that have no location of their own one
     StageInterface(Stage stage, const std::vector<StageValue>& values, VaryingPlaces& places);
 
-    /// A varying that has to share its place with another one of the program; null where there is none.
+    /// A varying that there is no place left for; null where there is none.
     const StageValue* unplaced() const { return mUnplaced; }
 
     /// A vertex input that has to share its attribute with another one; null where there is none.

@@ -1,5 +1,9 @@
 #include <Cg/Compiler/VaryingPlaces.h>
 
+#include <algorithm>
+#include <cstddef>
+#include <vector>
+
 namespace cg {
 
 namespace {
@@ -14,29 +18,40 @@ int firstChoice(const std::string& name) {
 
 } // namespace
 
-std::optional<int> VaryingPlaces::find(const std::string& name) const {
-    const auto found = mPlaces.find(name);
-    return found == mPlaces.end() ? std::nullopt : std::optional<int>(found->second);
+std::map<std::string, int> VaryingPlaces::assign(const std::set<std::string>& names) {
+    ++mProgram;
+    std::vector<std::pair<std::string, Occupancy>> known;
+    for (const std::string& name : names)
+        if (const auto found = mNames.find(name); found != mNames.end())
+            known.emplace_back(*found);
+    std::sort(known.begin(), known.end(),
+              [](const auto& a, const auto& b) { return a.second.program > b.second.program; });
+
+    std::map<std::string, int> places;
+    std::set<int> taken;
+    for (const auto& [name, occupancy] : known)
+        if (taken.insert(occupancy.place).second)
+            places[name] = occupancy.place;
+    for (const std::string& name : names)
+        if (places.count(name) == 0 && taken.size() < COUNT)
+            taken.insert(places[name] = oldestPlace(name, taken));
+    for (const auto& [name, place] : places) {
+        mNames[name] = {place, mProgram};
+        mLastPrograms[static_cast<std::size_t>(place)] = mProgram;
+    }
+    return places;
 }
 
-std::optional<int> VaryingPlaces::add(const std::string& name, const std::set<int>& taken) {
-    const int first = firstChoice(name);
-    std::optional<int> place;
+/// The place that has been without a program the longest, of those that are not taken: there is one.
+int VaryingPlaces::oldestPlace(const std::string& name, const std::set<int>& taken) const {
+    const auto lastProgram = [&](int place) { return mLastPrograms[static_cast<std::size_t>(place)]; };
+    int oldest = -1;
     for (int i = 0; i < COUNT; ++i) {
-        const int candidate = (first + i) % COUNT;
-        if (taken.count(candidate) != 0)
-            continue;
-        const bool isFree = !mIsUsed[static_cast<std::size_t>(candidate)];
-        if (!place || isFree)
-            place = candidate;
-        if (isFree)
-            break;
+        const int place = (firstChoice(name) + i) % COUNT;
+        if (taken.count(place) == 0 && (oldest < 0 || lastProgram(place) < lastProgram(oldest)))
+            oldest = place;
     }
-    if (!place)
-        return std::nullopt;
-    mIsUsed[static_cast<std::size_t>(*place)] = true;
-    mPlaces[name] = *place;
-    return place;
+    return oldest;
 }
 
 } // namespace cg
