@@ -81,18 +81,23 @@ bool isLength(char suffix) {
     return suffix == 'l' || suffix == 'i' || suffix == 's' || suffix == 't';
 }
 
+/// Bytes of a suffix that makes a float of any number.
+std::size_t floatSuffixAt(std::string_view text, std::size_t at) {
+    const char suffix = at < text.size() ? lower(text[at]) : '\0';
+    const char second = at + 1 < text.size() ? lower(text[at + 1]) : '\0';
+    if (suffix == 'l' && second == 'f') // as GLSL writes a double
+        return 2;
+    return suffix == 'f' || suffix == 'h' || suffix == 'x' || suffix == 'd' ? 1 : 0;
+}
+
 NumberSpelling::Kind withSuffix(std::string_view text, NumberSpelling& number, bool isWhole) {
     using Kind = NumberSpelling::Kind;
     const char suffix = number.length < text.size() ? lower(text[number.length]) : '\0';
     const char second = number.length + 1 < text.size() ? lower(text[number.length + 1]) : '\0';
-    if (suffix == 'f' || suffix == 'h' || suffix == 'x' || suffix == 'd') {
-        ++number.length;
+    const std::size_t floatSuffix = floatSuffixAt(text, number.length);
+    number.length += floatSuffix;
+    if (floatSuffix > 0)
         return suffix == 'h' ? Kind::HALF : suffix == 'x' ? Kind::FIXED : Kind::FLOAT;
-    }
-    if (suffix == 'l' && second == 'f') { // as GLSL writes a double
-        number.length += 2;
-        return Kind::FLOAT;
-    }
     if (!isWhole)
         return Kind::FLOAT;
     // An int of any length, `l` long, `i` int, `s` short and `t` char, is an int.
@@ -112,11 +117,13 @@ NumberSpelling readHexadecimal(std::string_view text) {
     return number;
 }
 
-/// `1.`, `1.5`, `1.f` and `1.e3` have a point; in `1.xxx` it belongs to a swizzle.
+/// `1.`, `1.5`, `1.f`, `1.e3` and `1.f.xxx` have a point; in `1.xxx` it belongs to a swizzle.
 bool hasPointAt(std::string_view text, std::size_t at) {
     if (at >= text.size() || text[at] != '.')
         return false;
-    const bool isBeforeSuffix = at + 2 == text.size();
+    const std::size_t suffix = floatSuffixAt(text, at + 1);
+    const std::size_t end = at + 1 + suffix;
+    const bool isBeforeSuffix = suffix > 0 && (end == text.size() || text[end] == '.');
     return !isSwizzle(text.substr(at)) || isBeforeSuffix || exponentAt(text, at + 1) > 0;
 }
 
