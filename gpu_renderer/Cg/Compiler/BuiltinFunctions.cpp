@@ -127,8 +127,8 @@ constexpr Row CG_ROWS[] = {
     {"debug", "v(4)", "cg_debug($0)", "cg_debug"},
 
     // Look-ups, 1D. The unused third coordinate of a depth look-up stands between the others in GLSL. Where
-    // it
-    // has a look-up of the old kind, that is taken: it gives the texels of a texture that compares no depth.
+    // it has a look-up of the old kind, that is taken: it gives the texels of a texture that compares no
+    // depth.
     {"tex1D", "4(s1,1)", "texture($0, $1)"},
     {"tex1D", "4(s1,1,i)", "textureOffset($0, $1, $2)"},
     {"tex1D", "4(s1,1,1,1)", "textureGrad($0, $1, $2, $3)"},
@@ -369,8 +369,7 @@ constexpr Helper HELPERS[] = {
                     "    return count;\n"
                     "}"},
     {"cg_bitfieldExtract", "T cg_bitfieldExtract(T x, int offset, int bits) {\n"
-                           "    if (bits == 0)\n        return T(0);\n"
-                           "    return (x << (32 - bits - offset)) >> (32 - bits);\n"
+                           "    return (x >> offset) & (bits == 32 ? ~0 : (1 << bits) - 1);\n"
                            "}"},
     {"cg_bitfieldInsert", "T cg_bitfieldInsert(T base, T insert, int offset, int bits) {\n"
                           "    int mask = (bits == 32 ? ~0 : (1 << bits) - 1) << offset;\n"
