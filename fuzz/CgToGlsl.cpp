@@ -1,13 +1,16 @@
 #include <Cg/Compiler/Compiler.h>
+#include <Cg/Compiler/VaryingPlaces.h>
 
 #include <cstdint>
 #include <cstdlib>
+#include <set>
 #include <sstream>
 #include <string>
 
 // The whole way from Cg to GLSL, on any bytes: nothing crashes, hangs or leaks, and the result is one that
-// Compiler.h promises. An input names its entries as the programs of tests/cg/ do, in lines "//! vertex NAME"
-// and "//! fragment NAME"; without them its function main is compiled for both stages.
+// Compiler.h promises. What was compiled before changes nothing in whether a program compiles. An input names
+// its entries as the programs of tests/cg/ do, in lines "//! vertex NAME" and "//! fragment NAME"; without
+// them its function main is compiled for both stages.
 
 namespace {
 
@@ -25,6 +28,18 @@ bool readHeader(const std::string&, std::string& text) {
     return true;
 }
 
+/// As if a process had compiled three programs: names that fuzzed programs are likely to have share places.
+cg::VaryingPlaces usedPlaces() {
+    cg::VaryingPlaces places;
+    for (const char* const word : {"OWN", "MY_OWN", "A"}) {
+        std::set<std::string> names;
+        for (int i = 0; i < cg::VaryingPlaces::COUNT; ++i)
+            names.insert("varying_" + std::string(word) + std::to_string(i));
+        places.assign(names);
+    }
+    return places;
+}
+
 void compileFor(cg::Stage stage, const std::string& entry, const std::string& source) {
     cg::CompileRequest request;
     request.source = source;
@@ -38,6 +53,11 @@ void compileFor(cg::Stage stage, const std::string& entry, const std::string& so
     const bool hasError = result.listing.find(" : error: ") != std::string::npos;
     const bool hasText = result.glsl.rfind("#version ", 0) == 0;
     if (result.ok == hasError || result.ok != hasText)
+        std::abort();
+    static const cg::VaryingPlaces used = usedPlaces();
+    cg::VaryingPlaces places = used; // of this input alone: it can be tried again
+    request.varyingPlaces = &places;
+    if (cg::compile(request).ok != result.ok)
         std::abort();
 }
 
