@@ -174,7 +174,8 @@ void GlslEmitter::nameGlobals() {
         if (mReferences.uses(variable))
             mVariableNames[variable] = mNames.global(variable->name);
     for (const Variable* variable : mProgram.temporaries)
-        mVariableNames[variable] = mNames.global(variable->name);
+        if (mReferences.uses(variable))
+            mVariableNames[variable] = mNames.global(variable->name);
     for (const Function* function : mProgram.functions) {
         std::string name(function->name);
         if (function->declaration && !function->declaration->ownerName.empty())
@@ -297,7 +298,8 @@ std::string GlslEmitter::uniforms() {
 std::string GlslEmitter::globals() {
     std::string text;
     for (const Variable* variable : mProgram.temporaries)
-        text += declare(variable->type, variableName(variable)) + ";\n";
+        if (mVariableNames.count(variable) != 0)
+            text += declare(variable->type, variableName(variable)) + ";\n";
     for (const Variable* variable : mProgram.uniforms)
         if (mUniformNames.count(variable) != 0)
             text += declare(variable->type, variableName(variable)) + ";\n";

@@ -28,6 +28,10 @@ constexpr int MAX_DEFAULT_ARGUMENTS = 4096; ///< in a whole program
 constexpr int MAX_SAMPLER_CALLS = 1024; ///< in a whole program
 constexpr int MAX_CHOICE_NODES = 200;   ///< of one argument
 
+/// A call is written out for each combination of the samplers that its arguments may be.
+constexpr std::size_t MAX_COMBINATIONS = 256;
+constexpr std::size_t MAX_CHOSEN_CALLS = 8192; ///< in a whole program
+
 /// The nodes of an expression as it is written out; counts no further than the limit.
 int countNodes(const TypedExpr* expression, int limit) {
     int count = 1;
@@ -400,6 +404,7 @@ void Resolver::resolveBody(Function* function, const FunctionDecl* definition,
             if (containsSampler(function->parameters[i]->type) && !isOpaque(function->parameters[i]->type))
                 addSamplerParameters(function, function->parameters[i]);
     function->body = block(definition->body);
+    endBody(function, definition);
 }
 
 // ----------------------------------------------------------------------------------------------- calls
@@ -631,7 +636,8 @@ TypedExpr* Resolver::callFunction(SourceLocation at, const FunctionDecl* declara
             Variable local;
             local.type = sources[owner]->type;
             local.name = "argument";
-            aliasSamplers(at, mBuild.variable(at, &local), sources[owner]);
+            if (TypedExpr* preparation = aliasSamplers(at, mBuild.variable(at, &local), sources[owner]))
+                before.push_back(preparation);
             const auto found = local.samplers.find(piece->samplerPath);
             if (found == local.samplers.end() || !found->second->alias)
                 return nullptr;
@@ -639,7 +645,7 @@ TypedExpr* Resolver::callFunction(SourceLocation at, const FunctionDecl* declara
             result->operands.push_back(found->second->alias);
         }
     }
-    result = withKnownSampler(result);
+    result = withKnownSamplers(result);
     return result ? around(result, before, after) : nullptr;
 }
 
@@ -649,6 +655,37 @@ bool Resolver::isPlainSampler(TypedExpr* sampler) const {
         const Variable* root = rootVariable(one);
         return root && mPlainSamplers.count(root->name) != 0;
     });
+}
+
+/// The call with each of its samplers known. Refuses one that would be written out too often.
+TypedExpr* Resolver::withKnownSamplers(TypedExpr* call) {
+    std::size_t combinations = 1;
+    for (TypedExpr* operand : call->operands) {
+        if (!isOpaque(operand->type))
+            continue;
+        if (operand->kind == Kind::CONSTRUCT) {
+            mDiagnostics.error(call->location,
+                               "an array of samplers whose elements were assigned cannot be passed on");
+            return nullptr;
+        }
+        std::size_t ways = 0;
+        for (const TypedExpr* sampler : samplersIn(operand)) {
+            const bool isAny = sampler->kind == Kind::ELEMENT && !constantValue(sampler->operands[1]);
+            ways += isAny ? static_cast<std::size_t>(sampler->operands[0]->type->length) : 1;
+        }
+        combinations *= ways;
+        if (combinations > MAX_COMBINATIONS) {
+            mDiagnostics.error(call->location, "more than " + std::to_string(MAX_COMBINATIONS) +
+                                                   " combinations of samplers in one call");
+            return nullptr;
+        }
+    }
+    mChosenCalls += combinations > 1 ? combinations : 0;
+    if (mChosenCalls > MAX_CHOSEN_CALLS) {
+        mDiagnostics.error(call->location, "too many calls with samplers that are chosen while it runs");
+        return nullptr;
+    }
+    return withKnownSampler(call);
 }
 
 /// GLSL knows no choice among samplers and indexes arrays of them by constants only: it becomes a choice
@@ -881,6 +918,15 @@ bool bind(const BuiltinFunction& function, const std::vector<TypedExpr*>& argume
     return true;
 }
 
+/// It compares neighbouring pixels, or adds to the level of detail that they give.
+bool isForFragments(const BuiltinFunction& function) {
+    const bool isDerivative = function.form.rfind("dFd", 0) == 0 || function.form.rfind("fwidth", 0) == 0;
+    constexpr Name BIAS = "bias";
+    const bool isBiased = function.name.size() > BIAS.size() &&
+                          function.name.substr(function.name.size() - BIAS.size()) == BIAS;
+    return isDerivative || isBiased;
+}
+
 /// `texture($0, $1.xy)` for arguments (s, c): the form `texture($0, $1)` for (s, c.xy).
 struct Expansion {
     std::string form;
@@ -1002,6 +1048,10 @@ TypedExpr* Resolver::callBuiltin(SourceLocation at, Name name, const std::vector
         return nullptr;
     }
 
+    if (mStage == Stage::VERTEX && isForFragments(*best)) {
+        mDiagnostics.error(at, inQuotes(name) + " is for fragment programs");
+        return nullptr;
+    }
     std::vector<TypedExpr*> before;
     std::vector<TypedExpr*> after;
     std::vector<TypedExpr*> passed;
@@ -1069,7 +1119,7 @@ TypedExpr* Resolver::callBuiltin(SourceLocation at, Name name, const std::vector
         result->isUntyped =
             std::all_of(passed.begin(), passed.end(), [](const TypedExpr* e) { return e->isUntyped; });
     }
-    result = withKnownSampler(result);
+    result = withKnownSamplers(result);
     result = result ? around(result, before, after) : nullptr;
     if (!result || lookup.resultSize == 0)
         return result;

@@ -279,6 +279,13 @@ void Resolver::resolveGlobal(Variable* variable, const VariableDecl* declaration
     const bool isUniform =
         containsSampler(type) || qualifiers.isUniform ||
         (!qualifiers.isStatic && !(qualifiers.isConst && value) && (!value || constantValue(value)));
+    if (qualifiers.isStatic && declaration->initializer && isOpaque(type)) { // a name for another one
+        variable->storage = Variable::Storage::LOCAL;
+        variable->alias = samplerValue(type, declaration->initializer);
+        if (!variable->alias)
+            variable->type = nullptr;
+        return;
+    }
     if (isUniform) {
         variable->storage = Variable::Storage::UNIFORM;
         bindState(variable);
@@ -618,6 +625,7 @@ void Resolver::resolveEntry(const FunctionDecl* declaration) {
     function->isBeingResolved = true;
     mInstances[declaration].push_back({{}, false, function});
     function->body = block(declaration->body);
+    endBody(function, declaration);
     function->isBeingResolved = false;
     mProgram->functions.push_back(function);
     mContext = Context();

@@ -383,6 +383,8 @@ TypedExpr* Resolver::elementOf(SourceLocation at, TypedExpr* object, TypedExpr* 
     }
     if (position && type->isVector())
         return mBuild.swizzle(at, object, {static_cast<int>((*position)[0])});
+    if (object->kind == Kind::CONSTRUCT && isOpaque(type))
+        return listedSampler(at, object, index);
     return mBuild.element(at, object, index);
 }
 
@@ -521,9 +523,8 @@ TypedExpr* Resolver::conditional(const ConditionalExpr* expr) {
     TypedExpr* condition = expression(expr->condition);
     TypedExpr* whenTrue = expression(expr->whenTrue);
     TypedExpr* whenFalse = expression(expr->whenFalse);
-    return condition && whenTrue && whenFalse
-               ? mBuild.conditional(expr->location, condition, whenTrue, whenFalse)
-               : nullptr;
+    return condition && whenTrue && whenFalse ? chosenOf(expr->location, condition, whenTrue, whenFalse)
+                                              : nullptr;
 }
 
 TypedExpr* Resolver::assignment(const AssignExpr* expr) {
@@ -536,16 +537,8 @@ TypedExpr* Resolver::assignment(const AssignExpr* expr) {
                 return object ? assignElements(expr, member, object) : nullptr;
         }
     }
-    TypedExpr* target = nullptr;
-    if (expr->target->kind == Expr::Kind::NAME) { // a sampler that is assigned anew, not what it stands for
-        const Name name = static_cast<const NameExpr*>(expr->target)->name;
-        Variable* variable = findVariable(name);
-        if (!variable && mGlobalDecls.count(name) != 0)
-            variable = globalVariable(mGlobalDecls[name]);
-        if (variable && isOpaque(variable->type))
-            target = mBuild.variable(at, variable);
-    }
-    if (!target)
+    TypedExpr* target = samplerPlace(expr->target);
+    if (!target || !isOpaque(target->type))
         target = expression(expr->target);
     TypedExpr* value = expression(expr->value);
     if (!target || !value)
@@ -560,9 +553,9 @@ TypedExpr* Resolver::assignment(const AssignExpr* expr) {
             return nullptr;
         if (target->kind == Kind::ELEMENT && target->type->isArray())
             return assignRow(at, target, value);
-        if (containsSampler(target->type))
-            aliasSamplers(at, target, value);
-        return mBuild.assign(at, target, value);
+        TypedExpr* samplers = containsSampler(target->type) ? aliasSamplers(at, target, value) : nullptr;
+        TypedExpr* result = mBuild.assign(at, target, value);
+        return samplers ? mBuild.comma(at, samplers, result) : result;
     }
     TypedExpr* combined = mBuild.binary(at, expr->op, target, value);
     combined = combined ? mBuild.convert(combined, target->type) : nullptr;
@@ -617,214 +610,6 @@ TypedExpr* Resolver::assignElements(const AssignExpr* expr, const MemberExpr* ta
             mBuild.assign(at, elements->operands[i],
                           mBuild.swizzle(at, mBuild.variable(at, place->variable), {static_cast<int>(i)})));
     return mBuild.comma(at, result, mBuild.variable(at, place->variable));
-}
-
-// -------------------------------------------------------------------------------------------- samplers
-
-namespace {
-
-/// The way from a variable down to a member: names with points, and the indices on the way.
-Variable* walk(const TypedExpr* expression, std::string& path, std::vector<const TypedExpr*>& elements) {
-    switch (expression->kind) {
-    case Kind::VARIABLE:
-        return expression->variable;
-    case Kind::FIELD: {
-        Variable* root = walk(expression->operands[0], path, elements);
-        const auto& fields = expression->operands[0]->type->structure->fields;
-        path += "." + std::string(fields[static_cast<std::size_t>(expression->index)].name);
-        return root;
-    }
-    case Kind::ELEMENT: {
-        Variable* root = walk(expression->operands[0], path, elements);
-        elements.push_back(expression);
-        return root;
-    }
-    default:
-        return nullptr;
-    }
-}
-
-/// Paths and types of all samplers in a type; those within arrays as one array each.
-void listSamplers(const Type* type, const std::string& path, int count,
-                  std::vector<std::pair<std::string, std::pair<const Type*, int>>>& out) {
-    if (type->isArray()) {
-        listSamplers(type->element, path, count * type->length, out);
-        return;
-    }
-    if (type->isSampler())
-        out.push_back({path, {type, count}});
-    if (type->isStruct())
-        for (const Field& field : type->structure->fields)
-            if (containsSampler(field.type))
-                listSamplers(field.type, path + "." + std::string(field.name), count, out);
-}
-
-} // namespace
-
-Variable* Resolver::samplerPiece(Variable* owner, const std::string& path, const Type* type) {
-    Variable*& piece = owner->samplers[path];
-    if (piece)
-        return piece;
-    std::string name(owner->name);
-    for (const char c : path)
-        name += c == '.' ? '_' : c;
-    piece = makeVariable(owner->storage, mArena.keep(name), type, nullptr);
-    piece->samplerOwner = owner;
-    piece->samplerPath = path;
-    if (owner->storage == Variable::Storage::UNIFORM)
-        mProgram->uniforms.push_back(piece);
-    return piece;
-}
-
-TypedExpr* Resolver::samplerMember(SourceLocation at, TypedExpr* object, Name name, const Type* type) {
-    std::string path;
-    std::vector<const TypedExpr*> elements;
-    Variable* root = walk(object, path, elements);
-    path += "." + std::string(name);
-    if (!root || (!elements.empty() && type->isArray())) {
-        mDiagnostics.error(at, "this sampler cannot be reached");
-        return nullptr;
-    }
-    int count = 1;
-    TypedExpr* index = nullptr;
-    for (const TypedExpr* element : elements) {
-        const int length = element->operands[0]->type->length;
-        TypedExpr* part = element->operands[1];
-        if (index) {
-            index = mBuild.binary(at, BinaryOp::MULTIPLY, index,
-                                  mBuild.literal(at, mTypes.scalar(Scalar::INT), length));
-            index = mBuild.binary(at, BinaryOp::ADD, index, part);
-        } else {
-            index = part;
-        }
-        count *= length;
-    }
-    Variable* piece = samplerPiece(root, path, index ? mTypes.array(type, count) : type);
-    if (isUnsetSampler(piece)) {
-        mDiagnostics.error(at, inQuotes(name) + " has been given no sampler");
-        return nullptr;
-    }
-    TypedExpr* whole = useVariable(at, piece);
-    return index ? mBuild.element(at, whole, index) : whole;
-}
-
-TypedExpr* Resolver::assignSampler(SourceLocation at, TypedExpr* target, TypedExpr* value) {
-    Variable* root = target->kind == Kind::VARIABLE ? target->variable : nullptr;
-    if (!root || mBuild.cost(value, target->type) == TypedBuilder::IMPOSSIBLE) {
-        mDiagnostics.error(at, "cannot assign '" + nameOf(value->type) + "' to this sampler");
-        return nullptr;
-    }
-    TypedExpr* preparation = nullptr;
-    if (rootVariable(value) != root)
-        alias(root, frozen(value, preparation));
-    return preparation ? preparation : nothing(at);
-}
-
-/// From now on the variable stands for another sampler.
-void Resolver::alias(Variable* variable, TypedExpr* sampler) {
-    mAliased.push_back({variable, variable->alias});
-    variable->alias = sampler;
-}
-
-/// The sampler as it is chosen now, whatever becomes of what it is chosen by.
-/// @param preparation  receives what keeps that, or nothing
-TypedExpr* Resolver::frozen(TypedExpr* sampler, TypedExpr*& preparation) {
-    const bool isChoice = sampler->kind == Kind::CONDITIONAL;
-    if (!isChoice && sampler->kind != Kind::ELEMENT)
-        return sampler;
-    TypedExpr* result = mArena.make<TypedExpr>(*sampler);
-    TypedExpr*& decision = result->operands[isChoice ? 0 : 1];
-    if (!constantValue(decision)) {
-        const SourceLocation at = decision->location;
-        Variable* place = makeVariable(Variable::Storage::LOCAL, "choice", decision->type, nullptr);
-        mProgram->temporaries.push_back(place); // other functions may look up the sampler, too
-        TypedExpr* keep = mBuild.assign(at, mBuild.variable(at, place), decision);
-        preparation = preparation ? mBuild.comma(at, preparation, keep) : keep;
-        decision = mBuild.variable(at, place);
-    }
-    if (isChoice)
-        for (std::size_t i = 1; i < result->operands.size(); ++i)
-            result->operands[i] = frozen(result->operands[i], preparation);
-    return result;
-}
-
-/// The samplers of a struct that is copied: those of the copy stand for those of the original.
-void Resolver::aliasSamplers(SourceLocation at, TypedExpr* target, TypedExpr* value) {
-    std::string targetPath;
-    std::string valuePath;
-    std::vector<const TypedExpr*> targetElements;
-    std::vector<const TypedExpr*> valueElements;
-    Variable* targetRoot = walk(target, targetPath, targetElements);
-    Variable* valueRoot = walk(value, valuePath, valueElements);
-    if (!targetRoot || !valueRoot || !targetElements.empty()) {
-        mDiagnostics.error(at, "samplers can only be copied between variables");
-        return;
-    }
-    std::vector<std::pair<std::string, std::pair<const Type*, int>>> pieces;
-    listSamplers(target->type, "", 1, pieces);
-    for (const auto& [path, typeAndCount] : pieces) {
-        const auto [type, count] = typeAndCount;
-        const Type* pieceType = count > 1 ? mTypes.array(type, count) : type;
-        Variable* piece = samplerPiece(targetRoot, targetPath + path, pieceType);
-        TypedExpr* source = nullptr;
-        if (valueElements.empty()) {
-            source = useVariable(at, samplerPiece(valueRoot, valuePath + path, pieceType));
-        } else if (valueElements.size() == 1 && count == 1) {
-            const TypedExpr* element = valueElements[0];
-            const Type* array = mTypes.array(type, element->operands[0]->type->length);
-            source = mBuild.element(at, useVariable(at, samplerPiece(valueRoot, valuePath + path, array)),
-                                    element->operands[1]);
-        }
-        if (source)
-            alias(piece, source);
-    }
-}
-
-/// A look-up has decided what kind a sampler is.
-void Resolver::agree(TypedExpr* sampler, const Type* type) {
-    if (sampler->kind == Kind::CONDITIONAL) {
-        for (TypedExpr* one : samplersIn(sampler))
-            agree(one, type);
-        sampler->type = type;
-        return;
-    }
-    Variable* root = rootVariable(sampler);
-    if (!root)
-        return;
-    (isDepthSampler(type->sampler) ? root->comparesDepth : root->givesColour) = true;
-    if (root->comparesDepth && root->givesColour)
-        mPlainSamplers.insert(root->name);
-    if (sampler->type == type)
-        return;
-    const Type* old = root->type;
-    const bool isArray = old->isArray() && !type->isArray();
-    root->type = isArray ? mTypes.array(type, old->length) : type;
-    for (TypedExpr* part = sampler; part; part = part->operands.empty() ? nullptr : part->operands[0])
-        part->type = part->kind == Kind::VARIABLE ? root->type : type;
-}
-
-/// The samplers among the members of an entry's parameter that is no uniform: they are uniforms nevertheless.
-/// @param outer  the variable around the entry's call
-void Resolver::addUniformSamplers(Variable* inner, Variable* outer) {
-    std::vector<std::pair<std::string, std::pair<const Type*, int>>> pieces;
-    listSamplers(inner->type, "", 1, pieces);
-    outer->storage = Variable::Storage::UNIFORM; // as its pieces are to be
-    for (const auto& [path, typeAndCount] : pieces) {
-        const auto [type, count] = typeAndCount;
-        samplerPiece(outer, path, count > 1 ? mTypes.array(type, count) : type);
-    }
-    outer->storage = Variable::Storage::LOCAL;
-    inner->samplers = outer->samplers;
-}
-
-void Resolver::addSamplerParameters(Function* function, Variable* parameter) {
-    std::vector<std::pair<std::string, std::pair<const Type*, int>>> pieces;
-    listSamplers(parameter->type, "", 1, pieces);
-    for (const auto& [path, typeAndCount] : pieces) {
-        const auto [type, count] = typeAndCount;
-        function->parameters.push_back(
-            samplerPiece(parameter, path, count > 1 ? mTypes.array(type, count) : type));
-    }
 }
 
 } // namespace cg

@@ -5,7 +5,6 @@
 
 #include <algorithm>
 #include <array>
-#include <map>
 
 namespace cg {
 
@@ -15,6 +14,27 @@ TypedStmt* make(Arena& arena, TypedStmt::Kind kind, TypedExpr* expression = null
     auto* stmt = arena.make<TypedStmt>(kind);
     stmt->expression = expression;
     return stmt;
+}
+
+/// It leaves no statement in the GLSL text, or only braces.
+bool isEmpty(const TypedStmt* stmt) {
+    return (stmt->kind == TypedStmt::Kind::SEQUENCE || stmt->kind == TypedStmt::Kind::BLOCK) &&
+           std::all_of(stmt->body.begin(), stmt->body.end(), isEmpty);
+}
+
+/// All ways through it end in `discard`.
+bool endsInDiscard(const TypedStmt* stmt) {
+    switch (stmt->kind) {
+    case TypedStmt::Kind::DISCARD:
+        return true;
+    case TypedStmt::Kind::BLOCK:
+    case TypedStmt::Kind::SEQUENCE:
+        return std::any_of(stmt->body.begin(), stmt->body.end(), endsInDiscard);
+    case TypedStmt::Kind::IF:
+        return stmt->body[1] && endsInDiscard(stmt->body[0]) && endsInDiscard(stmt->body[1]);
+    default:
+        return false;
+    }
 }
 
 } // namespace
@@ -34,19 +54,13 @@ TypedStmt* Resolver::statement(const Stmt* stmt) {
     case Kind::IF:
         return ifStatement(static_cast<const IfStmt*>(stmt));
     case Kind::FOR:
-        return forLoop(static_cast<const ForStmt*>(stmt));
+        return withSelectors(stmt->location, [&] { return forLoop(static_cast<const ForStmt*>(stmt)); });
     case Kind::WHILE:
-    case Kind::DO: {
-        const auto* loop = static_cast<const LoopStmt*>(stmt);
-        TypedExpr* condition = expression(loop->condition);
-        condition = condition ? mBuild.condition(condition) : nullptr;
-        TypedStmt* result =
-            make(mArena, stmt->kind == Kind::WHILE ? TypedStmt::Kind::WHILE : TypedStmt::Kind::DO, condition);
-        result->body = {scoped(loop->body)};
-        return condition ? result : nullptr;
-    }
+    case Kind::DO:
+        return withSelectors(stmt->location, [&] { return loop(static_cast<const LoopStmt*>(stmt)); });
     case Kind::SWITCH:
-        return switchStatement(static_cast<const SwitchStmt*>(stmt));
+        return withSelectors(stmt->location,
+                             [&] { return switchStatement(static_cast<const SwitchStmt*>(stmt)); });
     case Kind::CASE: {
         const auto* label = static_cast<const CaseStmt*>(stmt);
         TypedExpr* value = label->value ? expression(label->value) : nullptr;
@@ -60,9 +74,8 @@ TypedStmt* Resolver::statement(const Stmt* stmt) {
     case Kind::DISCARD:
         return discardStatement(static_cast<const JumpStmt*>(stmt));
     case Kind::BREAK:
-        return make(mArena, TypedStmt::Kind::BREAK);
     case Kind::CONTINUE:
-        return make(mArena, TypedStmt::Kind::CONTINUE);
+        return leave(stmt);
     }
     return nullptr;
 }
@@ -73,12 +86,22 @@ TypedStmt* Resolver::ifStatement(const IfStmt* stmt) {
     condition = condition ? mBuild.condition(condition) : nullptr;
     TypedStmt* result = make(mArena, TypedStmt::Kind::IF, condition);
     const std::size_t start = mAliased.size();
-    std::map<Variable*, std::array<TypedExpr*, 2>> assigned;
+    struct Assigned {
+        Variable* variable;
+        std::array<TypedExpr*, 2> samplers;
+    };
+    std::vector<Assigned> assigned; // in the order of the source
     const Stmt* const branches[] = {stmt->thenBranch, stmt->elseBranch};
     for (std::size_t i = 0; i < 2; ++i) {
         result->body.push_back(i == 0 || branches[i] ? scoped(branches[i]) : nullptr);
-        for (std::size_t one = start; one < mAliased.size(); ++one)
-            assigned[mAliased[one].variable][i] = mAliased[one].variable->alias;
+        for (std::size_t one = start; one < mAliased.size(); ++one) {
+            Variable* variable = mAliased[one].variable;
+            auto known = std::find_if(assigned.begin(), assigned.end(),
+                                      [&](const Assigned& other) { return other.variable == variable; });
+            if (known == assigned.end())
+                known = assigned.insert(known, {variable, {}});
+            known->samplers[i] = variable->alias;
+        }
         for (; mAliased.size() > start; mAliased.pop_back())
             mAliased.back().variable->alias = mAliased.back().before;
     }
@@ -95,8 +118,8 @@ TypedStmt* Resolver::ifStatement(const IfStmt* stmt) {
                                 : nullptr; // nothing yet: whatever the other branch gives
         TypedExpr* whenTrue = samplers[0] ? samplers[0] : before ? before : samplers[1];
         TypedExpr* whenFalse = samplers[1] ? samplers[1] : before ? before : samplers[0];
-        if (TypedExpr* choice = mBuild.conditional(stmt->location, mBuild.variable(stmt->location, taken),
-                                                   whenTrue, whenFalse))
+        if (TypedExpr* choice =
+                chosenOf(stmt->location, mBuild.variable(stmt->location, taken), whenTrue, whenFalse))
             alias(variable, choice);
     }
     return result;
@@ -174,7 +197,7 @@ void Resolver::declareLocal(const VariableDecl* declaration, std::vector<TypedSt
         if (!value)
             type = nullptr;
     } else if (type && declaration->initializer) {
-        TypedExpr* sampler = expression(declaration->initializer);
+        TypedExpr* sampler = samplerValue(type, declaration->initializer);
         TypedExpr* preparation = nullptr;
         variable->alias = sampler ? frozen(sampler, preparation) : nullptr;
         if (preparation)
@@ -193,7 +216,9 @@ void Resolver::declareLocal(const VariableDecl* declaration, std::vector<TypedSt
     if (!isSized || isOpaque(variable->type))
         return;
     if (value && containsSampler(variable->type))
-        aliasSamplers(declaration->location, mBuild.variable(declaration->location, variable), value);
+        if (TypedExpr* preparation =
+                aliasSamplers(declaration->location, mBuild.variable(declaration->location, variable), value))
+            out.push_back(make(mArena, TypedStmt::Kind::EXPR, preparation));
     TypedExpr* assigned = nullptr;
     if (value && mContext.isDeclaredUsed) { // GLSL knows the name only behind the initial value
         assigned =
@@ -207,6 +232,17 @@ void Resolver::declareLocal(const VariableDecl* declaration, std::vector<TypedSt
         out.push_back(make(mArena, TypedStmt::Kind::EXPR, assigned));
 }
 
+TypedStmt* Resolver::loop(const LoopStmt* stmt) {
+    TypedExpr* condition = expression(stmt->condition);
+    condition = condition ? mBuild.condition(condition) : nullptr;
+    TypedStmt* result = make(
+        mArena, stmt->kind == Stmt::Kind::WHILE ? TypedStmt::Kind::WHILE : TypedStmt::Kind::DO, condition);
+    ++mContext.loops;
+    result->body = {scoped(stmt->body)};
+    --mContext.loops;
+    return condition ? result : nullptr;
+}
+
 TypedStmt* Resolver::forLoop(const ForStmt* stmt) {
     const std::size_t outerScope = mContext.scope.size();
     TypedStmt* result = make(mArena, TypedStmt::Kind::FOR);
@@ -217,7 +253,9 @@ TypedStmt* Resolver::forLoop(const ForStmt* stmt) {
     }
     if (stmt->step)
         result->step = expression(stmt->step);
+    ++mContext.loops;
     result->body = {first, scoped(stmt->body)};
+    --mContext.loops;
     for (std::size_t i = outerScope; i < mContext.scope.size(); ++i)
         if (Variable* variable = mContext.scope[i].variable)
             mContext.pastLoops.push_back({variable, result});
@@ -251,11 +289,44 @@ TypedStmt* Resolver::switchStatement(const SwitchStmt* stmt) {
     if (!selector)
         return nullptr;
     TypedStmt* result = make(mArena, TypedStmt::Kind::SWITCH, selector);
+    ++mContext.switches;
     result->body = block(stmt->body)->body;
+    --mContext.switches;
+    // GLSL wants a statement behind the last label.
+    const auto last = std::find_if_not(result->body.rbegin(), result->body.rend(), isEmpty);
+    if (last != result->body.rend() && (*last)->kind == TypedStmt::Kind::CASE)
+        result->body.push_back(make(mArena, TypedStmt::Kind::BREAK));
     return result;
 }
 
+/// `break` and `continue`
+TypedStmt* Resolver::leave(const Stmt* stmt) {
+    const bool isBreak = stmt->kind == Stmt::Kind::BREAK;
+    if (mContext.loops == 0 && !(isBreak && mContext.switches > 0)) {
+        mDiagnostics.error(stmt->location, isBreak ? "'break' outside of a loop or a switch"
+                                                   : "'continue' outside of a loop");
+        return nullptr;
+    }
+    return make(mArena, isBreak ? TypedStmt::Kind::BREAK : TypedStmt::Kind::CONTINUE);
+}
+
+/// A function that gives a value has to say which. GLSL wants a `return` even where all is discarded.
+void Resolver::endBody(Function* function, const FunctionDecl* definition) {
+    if (function->result->isVoid() || mContext.hasReturn)
+        return;
+    if (!endsInDiscard(function->body)) {
+        mDiagnostics.error(definition->location, "function " + inQuotes(definition->name) +
+                                                     " has no 'return' for its '" + nameOf(function->result) +
+                                                     "'");
+        return;
+    }
+    TypedStmt* end = make(mArena, TypedStmt::Kind::RETURN);
+    end->expression = mBuild.zero(definition->location, function->result);
+    function->body->body.push_back(end);
+}
+
 TypedStmt* Resolver::returnStatement(const JumpStmt* stmt) {
+    mContext.hasReturn = true;
     const Type* wanted = mContext.function->result;
     TypedStmt* result = make(mArena, TypedStmt::Kind::RETURN);
     if (!stmt->value) {

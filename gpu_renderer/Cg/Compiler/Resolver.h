@@ -5,6 +5,7 @@
 #include <Cg/Compiler/TypedBuilder.h>
 #include <Cg/Compiler/TypedTree.h>
 
+#include <functional>
 #include <set>
 #include <string>
 #include <unordered_map>
@@ -55,6 +56,9 @@ private:
         Variable* declared = nullptr;                  ///< the one whose initial value is being resolved
         bool isDeclaredUsed = false;                   ///< that value names its own variable
         std::size_t ordinal = 0;                       ///< of the function's declaration
+        int loops = 0;                                 ///< around the statement
+        int switches = 0;
+        bool hasReturn = false;
     };
 
     struct Signature {
@@ -116,9 +120,12 @@ private:
     TypedStmt* ifStatement(const IfStmt* stmt);
     TypedStmt* declarations(const DeclStmt* stmt);
     void declareLocal(const VariableDecl* declaration, std::vector<TypedStmt*>& out);
+    TypedStmt* loop(const LoopStmt* stmt);
     TypedStmt* forLoop(const ForStmt* stmt);
     Variable* outliveLoop(SourceLocation at, Name name);
     Variable* ownValue(const NameExpr* expr);
+    TypedStmt* leave(const Stmt* stmt);
+    void endBody(Function* function, const FunctionDecl* definition);
     TypedStmt* returnStatement(const JumpStmt* stmt);
     TypedStmt* discardStatement(const JumpStmt* stmt);
     TypedStmt* switchStatement(const SwitchStmt* stmt);
@@ -143,7 +150,6 @@ private:
     TypedExpr* assignment(const AssignExpr* expr);
     TypedExpr* assignElements(const AssignExpr* expr, const MemberExpr* target, TypedExpr* matrix);
     TypedExpr* assignRow(SourceLocation at, TypedExpr* target, TypedExpr* value);
-    TypedExpr* assignSampler(SourceLocation at, TypedExpr* target, TypedExpr* value);
     TypedExpr* conditional(const ConditionalExpr* expr);
     TypedExpr* stateVariable(const Expr* expr);
     bool checkAssignable(SourceLocation at, TypedExpr* target);
@@ -179,6 +185,7 @@ private:
                             std::vector<TypedExpr*>& before, std::vector<TypedExpr*>& after);
     TypedExpr* around(TypedExpr* call, const std::vector<TypedExpr*>& before,
                       const std::vector<TypedExpr*>& after);
+    TypedExpr* withKnownSamplers(TypedExpr* call);
     TypedExpr* withKnownSampler(TypedExpr* call);
     TypedExpr* withSimpleOperands(TypedExpr* call, std::size_t position);
     TypedExpr* chooseCall(TypedExpr* call, std::size_t position);
@@ -192,9 +199,22 @@ private:
     // Samplers
     TypedExpr* samplerMember(SourceLocation at, TypedExpr* object, Name name, const Type* type);
     Variable* samplerPiece(Variable* owner, const std::string& path, const Type* type);
-    void aliasSamplers(SourceLocation at, TypedExpr* target, TypedExpr* value);
+    TypedExpr* aliasSamplers(SourceLocation at, TypedExpr* target, TypedExpr* value);
     void agree(TypedExpr* sampler, const Type* type);
     void alias(Variable* variable, TypedExpr* sampler);
+    TypedExpr* samplerPlace(const Expr* target);
+    TypedExpr* assignSampler(SourceLocation at, TypedExpr* target, TypedExpr* value);
+    TypedExpr* giveSampler(SourceLocation at, Variable* variable, TypedExpr* sampler);
+    TypedExpr* giveElement(SourceLocation at, const TypedExpr* element, TypedExpr* sampler);
+    TypedExpr* samplerValue(const Type* type, const Expr* expr);
+    TypedExpr* listedSampler(SourceLocation at, TypedExpr* list, TypedExpr* index);
+    bool isOfBlocksAround(const Variable* sampler) const;
+    TypedExpr* chosenOf(SourceLocation at, TypedExpr* condition, TypedExpr* whenTrue, TypedExpr* whenFalse);
+    bool isUnset(const TypedExpr* sampler) const;
+    TypedStmt* withSelectors(SourceLocation at, const std::function<TypedStmt*()>& resolve);
+    bool addSelector(SourceLocation at, Variable* variable, const std::vector<TypedExpr*>& given,
+                     std::vector<TypedStmt*>& before);
+    TypedExpr* numberOf(SourceLocation at, const std::vector<TypedExpr*>& samplers, TypedExpr* sampler);
     TypedExpr* frozen(TypedExpr* sampler, TypedExpr*& preparation);
 
     // The entry
@@ -240,12 +260,29 @@ private:
         TypedExpr* before;
     };
 
-    std::vector<Aliasing> mAliased; ///< in their order
+    /// A sampler that was given to a variable.
+    struct Gift {
+        Variable* variable;
+        TypedExpr* sampler;
+        const Function* giver;
+    };
+
+    /// A sampler variable that changes in a loop or a `switch`: a number says which of these it stands for.
+    struct Selector {
+        Variable* number;
+        std::vector<TypedExpr*> samplers;
+    };
+
+    std::vector<Aliasing> mAliased;                           ///< in their order
+    std::vector<Gift> mGifts;                                 ///< all of them, also those of branches
+    std::unordered_map<const Variable*, Selector> mSelectors; ///< of the loops and switches around
+    int mSelections = 0;
     const Expr* mIndexed = nullptr; ///< what stands before the brackets that are being resolved
     Context mContext;
     int mCallDepth = 0;
     int mDefaultArguments = 0;
     int mSamplerCalls = 0;
+    std::size_t mChosenCalls = 0; ///< that stand for calls with samplers to be chosen
 };
 
 } // namespace cg
