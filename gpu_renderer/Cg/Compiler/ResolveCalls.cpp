@@ -639,8 +639,12 @@ TypedExpr* Resolver::callFunction(SourceLocation at, const FunctionDecl* declara
             if (TypedExpr* preparation = aliasSamplers(at, mBuild.variable(at, &local), sources[owner]))
                 before.push_back(preparation);
             const auto found = local.samplers.find(piece->samplerPath);
-            if (found == local.samplers.end() || !found->second->alias)
+            const bool isKnown = found != local.samplers.end() && found->second->alias;
+            if (!isKnown || isUnset(found->second->alias)) {
+                mDiagnostics.error(at, inQuotes(piece->samplerPath.substr(1)) +
+                                           " of an argument has been given no sampler");
                 return nullptr;
+            }
             agree(found->second->alias, piece->type->isArray() ? piece->type->element : piece->type);
             result->operands.push_back(found->second->alias);
         }

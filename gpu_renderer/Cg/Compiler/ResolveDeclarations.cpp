@@ -408,10 +408,24 @@ TypedExpr* Resolver::fillPieces(SourceLocation at, const Type* type, ListCursor&
     else
         return fill(type, cursor);
     TypedExpr* whole = mBuild.make(TypedExpr::Kind::CONSTRUCT, at, type);
-    for (const Type* piece : pieces) {
-        if (!piece)
+    for (std::size_t i = 0; i < pieces.size(); ++i) {
+        if (!pieces[i]) { // a sampler has no place in the value, and may be left out
+            const bool isValue = cursor.value || (!isAtEnd(cursor) && cursor.elements[cursor.next]->kind !=
+                                                                          Expr::Kind::INIT_LIST);
+            TypedExpr* sampler = isValue ? nextValue(cursor) : nullptr;
+            if (isValue && !sampler)
+                return nullptr;
+            const Type* wanted = type->structure->fields[i].type;
+            if (!sampler || !sampler->type->isSampler() || !wanted->isSampler())
+                continue;
+            mListedSamplers[whole][i] = mBuild.convert(sampler, wanted);
+            if (!mListedSamplers[whole][i])
+                return nullptr;
+            ++cursor.next;
+            cursor.value = nullptr;
             continue;
-        TypedExpr* value = fill(piece, cursor);
+        }
+        TypedExpr* value = fill(pieces[i], cursor);
         if (!value)
             return nullptr;
         whole->operands.push_back(value);

@@ -185,6 +185,31 @@ TypedExpr* Resolver::giveSampler(SourceLocation at, Variable* variable, TypedExp
     return effect ? mBuild.comma(at, effect, assigned) : assigned;
 }
 
+/// The samplers of a list in braces, to the members of the struct that it makes.
+TypedExpr* Resolver::giveListed(SourceLocation at, Variable* root, const std::string& path,
+                                const TypedExpr* list) {
+    TypedExpr* effects = nullptr;
+    std::size_t next = 0;
+    const auto& fields = list->type->structure->fields;
+    for (std::size_t i = 0; i < fields.size(); ++i) {
+        const std::string way = path + "." + std::string(fields[i].name);
+        TypedExpr* effect = nullptr;
+        if (isOpaque(fields[i].type)) {
+            const auto& samplers = mListedSamplers[list];
+            const auto listed = samplers.find(i);
+            if (listed != samplers.end())
+                effect = giveSampler(at, samplerPiece(root, way, fields[i].type), listed->second);
+        } else if (next < list->operands.size()) {
+            const TypedExpr* inner = list->operands[next++];
+            if (containsSampler(inner->type) && inner->kind == Kind::CONSTRUCT && inner->type->isStruct())
+                effect = giveListed(at, root, way, inner);
+        }
+        if (effect)
+            effects = effects ? mBuild.comma(at, effects, effect) : effect;
+    }
+    return effects;
+}
+
 /// One element of an array of samplers: the array stands for a list from now on.
 TypedExpr* Resolver::giveElement(SourceLocation at, const TypedExpr* element, TypedExpr* sampler) {
     Variable* array = element->operands[0]->variable;
@@ -479,6 +504,8 @@ TypedExpr* Resolver::aliasSamplers(SourceLocation at, TypedExpr* target, TypedEx
     std::vector<const TypedExpr*> targetElements;
     std::vector<const TypedExpr*> valueElements;
     Variable* targetRoot = walk(target, targetPath, targetElements);
+    if (targetRoot && targetElements.empty() && value->kind == Kind::CONSTRUCT && value->type->isStruct())
+        return giveListed(at, targetRoot, targetPath, value);
     Variable* valueRoot = walk(value, valuePath, valueElements);
     if (!targetRoot || !valueRoot || !targetElements.empty()) {
         mDiagnostics.error(at, "samplers can only be copied between variables");

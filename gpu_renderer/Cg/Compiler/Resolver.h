@@ -6,6 +6,7 @@
 #include <Cg/Compiler/TypedTree.h>
 
 #include <functional>
+#include <map>
 #include <set>
 #include <string>
 #include <unordered_map>
@@ -205,6 +206,7 @@ private:
     TypedExpr* samplerPlace(const Expr* target);
     TypedExpr* assignSampler(SourceLocation at, TypedExpr* target, TypedExpr* value);
     TypedExpr* giveSampler(SourceLocation at, Variable* variable, TypedExpr* sampler);
+    TypedExpr* giveListed(SourceLocation at, Variable* root, const std::string& path, const TypedExpr* list);
     TypedExpr* giveElement(SourceLocation at, const TypedExpr* element, TypedExpr* sampler);
     TypedExpr* samplerValue(const Type* type, const Expr* expr);
     TypedExpr* listedSampler(SourceLocation at, TypedExpr* list, TypedExpr* index);
@@ -273,7 +275,9 @@ private:
         std::vector<TypedExpr*> samplers;
     };
 
-    std::vector<Aliasing> mAliased;                           ///< in their order
+    std::vector<Aliasing> mAliased; ///< in their order
+    std::unordered_map<const TypedExpr*, std::map<std::size_t, TypedExpr*>>
+        mListedSamplers;                                      ///< of structs made from lists, by field
     std::vector<Gift> mGifts;                                 ///< all of them, also those of branches
     std::unordered_map<const Variable*, Selector> mSelectors; ///< of the loops and switches around
     int mSelections = 0;
