@@ -178,6 +178,8 @@ Variable* Resolver::findVariable(Name name) {
 }
 
 TypedExpr* Resolver::useVariable(SourceLocation at, Variable* variable) {
+    if (isOpaque(variable->type) && mContext.function && mContext.function != mProgram->entry)
+        mSamplerUsers[variable].insert(mContext.function);
     if (variable->alias) {
         Variable* original = rootVariable(variable->alias);
         return original == variable ? mBuild.variable(at, variable) : variable->alias;

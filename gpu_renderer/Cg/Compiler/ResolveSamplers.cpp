@@ -4,6 +4,7 @@
 #include <Cg/Compiler/Diagnostics.h>
 
 #include <algorithm>
+#include <set>
 #include <string>
 #include <utility>
 
@@ -320,6 +321,11 @@ TypedExpr* Resolver::chosenOf(SourceLocation at, TypedExpr* condition, TypedExpr
 
 /// From now on the variable stands for another sampler.
 void Resolver::alias(Variable* variable, TypedExpr* sampler) {
+    const std::set<const Function*>& users = mSamplerUsers[variable];
+    if (users.size() > users.count(mContext.function))
+        mDiagnostics.error(sampler->location,
+                           inQuotes(variable->name) +
+                               " is assigned after a function that looks it up was called");
     mAliased.push_back({variable, variable->alias});
     mGifts.push_back({variable, sampler, mContext.function});
     variable->alias = sampler;

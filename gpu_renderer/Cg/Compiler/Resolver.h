@@ -277,8 +277,10 @@ private:
 
     std::vector<Aliasing> mAliased; ///< in their order
     std::unordered_map<const TypedExpr*, std::map<std::size_t, TypedExpr*>>
-        mListedSamplers;                                      ///< of structs made from lists, by field
-    std::vector<Gift> mGifts;                                 ///< all of them, also those of branches
+        mListedSamplers; ///< of structs made from lists, by field
+    std::unordered_map<const Variable*, std::set<const Function*>>
+        mSamplerUsers;        ///< functions that are resolved once, of the samplers of the program
+    std::vector<Gift> mGifts; ///< all of them, also those of branches
     std::unordered_map<const Variable*, Selector> mSelectors; ///< of the loops and switches around
     int mSelections = 0;
     const Expr* mIndexed = nullptr; ///< what stands before the brackets that are being resolved
