@@ -10,10 +10,11 @@ namespace {
 
 /// Stages four floats, or as many of them as the entry has.
 void stageFour(CgParamUnit& unit, const std::array<float, 4>& values) {
-    const size_t count = std::min<size_t>(values.size(), unit.getTotalSize());
     float* const staged = unit.getValue();
-    for (size_t i = 0; i < count; ++i)
-        staged[i] = values[i];
+    if (unit.getTotalSize() >= values.size())
+        std::copy(values.begin(), values.end(), staged); // of a fixed size: no call, no loop
+    else
+        std::copy_n(values.begin(), unit.getTotalSize(), staged);
 }
 
 } // namespace
