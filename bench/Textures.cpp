@@ -152,6 +152,7 @@ public:
         glBindBuffer(GL_PIXEL_PACK_BUFFER, mOnDevice);
         glBufferData(GL_PIXEL_PACK_BUFFER, GLsizeiptr{getPitch()} * getHeight(), nullptr, GL_STATIC_COPY);
         glBindBuffer(GL_PIXEL_PACK_BUFFER, 0);
+        readbackGLTexToPBO(0); // memory that nobody has written yet may all be one page of zeros
     }
     GLuint onDevice() const { return mOnDevice; }
 
