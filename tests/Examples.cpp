@@ -26,7 +26,7 @@ struct ExampleRun {
 /// Runs an example as it was built. The driver's own memory seems to leak when a program lets go of it.
 ExampleRun runExample(const std::string& exampleAndArguments, const std::string& environment = "") {
     const std::string command = environment +
-                                " ASAN_OPTIONS=\"$ASAN_OPTIONS:detect_leaks=0\" " FWZEL_EXAMPLES_BUILT "/" +
+                                " ASAN_OPTIONS=\"$ASAN_OPTIONS:detect_leaks=0\" '" FWZEL_EXAMPLES_BUILT "/'" +
                                 exampleAndArguments + " 2>&1";
     std::FILE* const pipe = popen(command.c_str(), "r");
     std::string output;
@@ -74,14 +74,14 @@ TEST_F(Examples, ReadbackFileShowsThePatternToTheByte) {
 }
 
 TEST_F(Examples, CgProgramsDrawWithTheirParameters) {
-    const ExampleRun example = runExample("cg_parameters " FWZEL_EXAMPLES "/cg_parameters.cg");
+    const ExampleRun example = runExample("cg_parameters '" FWZEL_EXAMPLES "/cg_parameters.cg'");
     EXPECT_EQ(example.exitCode, 0);
     EXPECT_EQ(example.output, "plane: 217 82 115\nbox: 255 204 0\n");
 }
 
 TEST_F(Examples, WhatTheContextLacksIsNamed) {
     for (const char* const call : {"smallest_host", "producer_thread", "readback_to_file /dev/null",
-                                   "cg_parameters " FWZEL_EXAMPLES "/cg_parameters.cg"}) {
+                                   "cg_parameters '" FWZEL_EXAMPLES "/cg_parameters.cg'"}) {
         const ExampleRun example = runExample(call, "MESA_EXTENSION_OVERRIDE=-GL_EXT_framebuffer_object");
         EXPECT_EQ(example.exitCode, 1) << call;
         EXPECT_NE(example.output.find(" lacks framebuffers and mip maps ("), std::string::npos)
