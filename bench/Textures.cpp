@@ -143,15 +143,16 @@ void addUploads(const Size& size, const Format& format) {
         [=] { texture->copyPBOToGLTex(0); });
 }
 
-/// A texture with content, and a buffer for its pixels on the device.
+/// A texture with content, and the buffer on the device that its pixels pass through: both sides use the same
+/// memory, since what lies in the cache decides the time of a copy.
 class ReadTexture : public Texture {
 public:
     explicit ReadTexture(const TexArgs& args) : Texture(VideoTestImage::COLOUR_BAR_75, args) {
         copyHostBufToGLTex(0);
-        glGenBuffers(1, &mOnDevice); // lives as long as the context
-        glBindBuffer(GL_PIXEL_PACK_BUFFER, mOnDevice);
-        glBufferData(GL_PIXEL_PACK_BUFFER, GLsizeiptr{getPitch()} * getHeight(), nullptr, GL_STATIC_COPY);
-        glBindBuffer(GL_PIXEL_PACK_BUFFER, 0);
+        constexpr GLuint ABOVE_ALL_NAMES = 4096;
+        for (GLuint name = ABOVE_ALL_NAMES; mOnDevice == 0 && --name > 0;) // the last made beside the PBO
+            if (glIsBuffer(name) == GL_TRUE && name != getPboID(0))
+                mOnDevice = name;
         readbackGLTexToPBO(0); // memory that nobody has written yet may all be one page of zeros
     }
     GLuint onDevice() const { return mOnDevice; }
