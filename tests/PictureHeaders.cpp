@@ -2,6 +2,7 @@
 #include <FwZel/PictureSize.h>
 #include <FwZel/PngFile.h>
 #include <FwZel/PpmFile.h>
+#include <FwZel/RefusalWords.h>
 #include <FwZel/VideoTestImage.h>
 
 #include <fixture/PictureFiles.h>
@@ -242,6 +243,8 @@ TEST(PictureFiles, SizesAreMultipliedWithoutWrapping) {
     EXPECT_TRUE(pictureFits(0xFFFFFFFF, 0xFFFFFFFF, 0));
     EXPECT_TRUE(pictureFits(0x7FFFFFFF, 1, 1));
     EXPECT_FALSE(pictureFits(0x80000000, 1, 1));
+    EXPECT_TRUE(pictureFits(0x1FFFFFFF, 1, 4));
+    EXPECT_FALSE(pictureFits(0x20000000, 1, 4));
     EXPECT_TRUE(pictureFits(32768, 16383, 4));
     EXPECT_FALSE(pictureFits(32768, 16384, 4));
     EXPECT_FALSE(pictureFits(65536, 65536, 4));

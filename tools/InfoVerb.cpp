@@ -7,6 +7,8 @@
 
 #include <CLI/CLI.hpp>
 
+#include <algorithm>
+#include <cctype>
 #include <iostream>
 #include <memory>
 #include <stdexcept>
@@ -20,10 +22,11 @@ std::string describe(const std::string& file) {
     uint32_t height = 0;
     uint32_t bytesPerColour = 0;
     VideoTestImage::getWidthHeightFromFile(file, &width, &height, &bytesPerColour);
-    const std::string extension = file.substr(file.length() - 3);
-    return file + ": " + (extension == "png" ? "PNG" : "PPM") + ", " + std::to_string(width) + " x " +
-           std::to_string(height) + ", " + std::to_string(bytesPerColour) +
-           (bytesPerColour == 1 ? " byte" : " bytes") + " a component\n";
+    std::string format = file.substr(file.find_last_of('.') + 1);
+    std::transform(format.begin(), format.end(), format.begin(),
+                   [](unsigned char c) { return static_cast<char>(std::toupper(c)); });
+    return file + ": " + format + ", " + std::to_string(width) + " x " + std::to_string(height) + ", " +
+           std::to_string(bytesPerColour) + (bytesPerColour == 1 ? " byte" : " bytes") + " a component\n";
 }
 
 void info(const std::vector<std::string>& files) {

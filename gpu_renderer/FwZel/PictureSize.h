@@ -2,7 +2,9 @@
 #define FWZEL_PICTURESIZE_H
 
 #include <cstdint>
-#include <string>
+
+/// @file
+/// The sizes of pictures that a texture holds.
 
 /// The first size in bytes that a host buffer cannot have: sizes are kept in 32 bits, signed in places.
 constexpr uint64_t HOST_BUFFER_LIMIT = uint64_t{1} << 31;
@@ -19,12 +21,6 @@ constexpr uint64_t HOST_BUFFER_LIMIT = uint64_t{1} << 31;
 constexpr bool pictureFits(uint32_t width, uint32_t height, uint32_t bytesPerPixel) {
     // The product of three could pass 64 bits, so the third divides the limit instead.
     return bytesPerPixel == 0 || uint64_t{width} * height <= (HOST_BUFFER_LIMIT - 1) / bytesPerPixel;
-}
-
-/// What is said of a picture that does not fit.
-inline std::string tooLargeInWords(uint32_t width, uint32_t height) {
-    return "its " + std::to_string(width) + " x " + std::to_string(height) +
-           " pixels of four bytes reach 2 GiB, more than a texture holds";
 }
 
 #endif

@@ -3,6 +3,7 @@
 #include <FwZel/FieldRows.h>
 #include <FwZel/HalfFloat.h>
 #include <FwZel/PictureSize.h>
+#include <FwZel/RefusalWords.h>
 #include <FwZel/RowExpansion.h>
 #include <FwZel/Texture.h>
 
@@ -99,17 +100,15 @@ private:
 
 PngReading::~PngReading() {
     png_destroy_read_struct(&mPng, &mInfo, nullptr);
-    if (mFile != nullptr) {
+    if (mFile != nullptr)
         std::fclose(mFile);
-    }
 }
 
 // The one place that libpng jumps back to. A step has no local with a destructor.
 template <class Step>
 bool PngReading::guarded(Step step) {
-    if (setjmp(png_jmpbuf(mPng)) != 0) { // libpng's only way to report an error
+    if (setjmp(png_jmpbuf(mPng)) != 0) // libpng's only way to report an error
         return false;
-    }
     step();
     return true;
 }
@@ -138,17 +137,15 @@ Refusal PngReading::readSignature(const char* fileName) {
 
 Refusal PngReading::readHeader(const char* fileName) {
     const Refusal refusal = readSignature(fileName);
-    if (refusal != Refusal::NONE) {
+    if (refusal != Refusal::NONE)
         return refusal;
-    }
     // libpng takes no caller that was built for another series, so the version is that of its header.
     const bool isKept = mErrors == Errors::KEPT;
     mPng = png_create_read_struct(PNG_LIBPNG_VER_STRING, isKept ? this : nullptr,
                                   isKept ? keepError : nullptr, isKept ? dropWarning : nullptr);
     mInfo = mPng != nullptr ? png_create_info_struct(mPng) : nullptr;
-    if (mInfo == nullptr) {
+    if (mInfo == nullptr)
         return Refusal::NO_MEMORY;
-    }
     const bool isRead = guarded([this] {
         png_init_io(mPng, mFile);
         png_set_sig_bytes(mPng, SIGNATURE_BYTES);
@@ -165,37 +162,32 @@ Refusal PngReading::readHeader(const char* fileName) {
 }
 
 Refusal PngReading::judgeContent() const {
-    if (mColourType != PNG_COLOR_TYPE_RGB_ALPHA && mColourType != PNG_COLOR_TYPE_RGB) {
+    if (mColourType != PNG_COLOR_TYPE_RGB_ALPHA && mColourType != PNG_COLOR_TYPE_RGB)
         return Refusal::COLOUR_TYPE;
-    }
     return pictureFits(mWidth, mHeight, COMPONENTS) ? Refusal::NONE : Refusal::TOO_LARGE;
 }
 
 void PngReading::demandRgbaBytes() {
     png_set_scale_16(mPng);
-    if (png_get_valid(mPng, mInfo, PNG_INFO_tRNS) != 0) {
+    if (png_get_valid(mPng, mInfo, PNG_INFO_tRNS) != 0)
         png_set_tRNS_to_alpha(mPng);
-    } else if ((mColourType & PNG_COLOR_MASK_ALPHA) == 0) {
+    else if ((mColourType & PNG_COLOR_MASK_ALPHA) == 0)
         png_set_add_alpha(mPng, 0xFF, PNG_FILLER_AFTER);
-    }
     png_read_update_info(mPng, mInfo);
 }
 
 bool PngReading::readRows(const Destination& to) {
     mRow.reset(new (std::nothrow) uint8_t[size_t{mWidth} * COMPONENTS]);
-    if (!mRow) {
+    if (!mRow)
         return false;
-    }
     return guarded([this, &to] {
         demandRgbaBytes();
-        if (png_get_rowbytes(mPng, mInfo) != size_t{mWidth} * COMPONENTS) {
+        if (png_get_rowbytes(mPng, mInfo) != size_t{mWidth} * COMPONENTS)
             png_error(mPng, "row of unexpected size");
-        }
-        if (png_get_interlace_type(mPng, mInfo) == PNG_INTERLACE_NONE) {
+        if (png_get_interlace_type(mPng, mInfo) == PNG_INTERLACE_NONE)
             readSequentialRows(to);
-        } else {
+        else
             readAdam7Rows(to);
-        }
     });
 }
 
@@ -205,16 +197,14 @@ void PngReading::readSequentialRows(const Destination& to) {
     const uint32_t rows = to.field.inFile(mHeight, to.rowCount);
     uint32_t fileRow = 0;
     for (uint32_t y = 0; y < rows; ++y, ++fileRow) {
-        for (; fileRow < to.field.first + y * to.field.step; ++fileRow) {
+        for (; fileRow < to.field.first + y * to.field.step; ++fileRow)
             png_read_row(mPng, nullptr, nullptr);
-        }
         unsigned char* const row = to.rows + y * to.pitch;
         png_read_row(mPng, isDirect ? row : mRow.get(), nullptr);
-        if (to.bytesPerElement != 1) {
+        if (to.bytesPerElement != 1)
             expansion.samplesToHalf(mRow.get(), row, to.elements);
-        } else if (!isDirect) {
+        else if (!isDirect)
             std::memcpy(row, mRow.get(), to.elements);
-        }
     }
 }
 
@@ -230,9 +220,8 @@ void PngReading::readAdam7Rows(const Destination& to) {
             const uint32_t fileRow = PNG_ROW_FROM_PASS_ROW(passRow, pass);
             const uint32_t y = (fileRow - to.field.first) / to.field.step;
             const bool isInField = fileRow % to.field.step == to.field.first;
-            if (isInField && y < rows) {
+            if (isInField && y < rows)
                 placePixels(to, to.rows + y * to.pitch, pass);
-            }
         }
     }
 }
@@ -248,9 +237,8 @@ void PngReading::placePixels(const Destination& to, unsigned char* row, int pass
             std::memcpy(row + e, pixel, count);
             continue;
         }
-        for (size_t c = 0; c < count; ++c) {
+        for (size_t c = 0; c < count; ++c)
             std::memcpy(row + 2 * (e + c), &HALF_FLOAT_CODES[pixel[c]], 2);
-        }
     }
 }
 
@@ -270,9 +258,9 @@ std::string inWords(Refusal refusal, const PngReading& file) {
     case Refusal::NONE:
         break;
     case Refusal::NOT_OPENED:
-        return std::string("it cannot be opened: ") + std::strerror(file.systemError());
+        return notOpenedInWords(file.systemError());
     case Refusal::NOT_READ:
-        return std::string("it cannot be read: ") + std::strerror(file.systemError());
+        return notReadInWords(file.systemError());
     case Refusal::NO_SIGNATURE:
         return "it does not start with the PNG signature";
     case Refusal::NO_MEMORY:
@@ -292,14 +280,12 @@ std::string inWords(Refusal refusal, const PngReading& file) {
 
 int getWidthHeightFromPngFile(std::string fname, uint32_t* width, uint32_t* height, uint32_t* bytePerCol) {
     PngReading file(PngReading::Errors::PRINTED);
-    if (file.readHeader(fname.c_str()) != Refusal::NONE) {
+    if (file.readHeader(fname.c_str()) != Refusal::NONE)
         return -1;
-    }
     *width = file.width();
     *height = file.height();
-    if (file.judgeContent() == Refusal::COLOUR_TYPE) {
+    if (file.judgeContent() == Refusal::COLOUR_TYPE)
         return -1;
-    }
     *bytePerCol = file.bitDepth() == 8 ? 1 : 2;
     return 0;
 }
@@ -309,13 +295,11 @@ void fillTextureFromPngFile(std::string filename, Texture* tex, uint32_t texBufI
     Destination to = {};
     to.rows = tex->getAddress(texBufIndex);
     to.bytesPerElement = tex->getBytesPerColour();
-    if (to.rows == nullptr || (to.bytesPerElement != 1 && to.bytesPerElement != 2)) {
+    if (to.rows == nullptr || (to.bytesPerElement != 1 && to.bytesPerElement != 2))
         return;
-    }
     PngReading file(PngReading::Errors::PRINTED);
-    if (file.readHeader(filename.c_str()) != Refusal::NONE || file.judgeContent() != Refusal::NONE) {
+    if (file.readHeader(filename.c_str()) != Refusal::NONE || file.judgeContent() != Refusal::NONE)
         return;
-    }
     to.pitch = tex->getPitch();
     to.rowCount = tex->getHeight();
     to.elements = std::min({size_t{file.width()} * COMPONENTS, size_t{tex->getWidth()} * tex->getNumColours(),
@@ -327,8 +311,7 @@ void fillTextureFromPngFile(std::string filename, Texture* tex, uint32_t texBufI
 std::string refusalOfPngFile(const std::string& fileName) {
     PngReading file(PngReading::Errors::KEPT);
     Refusal refusal = file.readHeader(fileName.c_str());
-    if (refusal == Refusal::NONE) {
+    if (refusal == Refusal::NONE)
         refusal = file.judgeContent();
-    }
     return inWords(refusal, file);
 }

@@ -3,6 +3,7 @@
 #include <FwZel/FieldRows.h>
 #include <FwZel/PictureSize.h>
 #include <FwZel/PpmBytes.h>
+#include <FwZel/RefusalWords.h>
 #include <FwZel/RowExpansion.h>
 #include <FwZel/Texture.h>
 #include <FwZel/VideoTestImage.h>
@@ -51,15 +52,12 @@ ReadResult readLine(FILE* fp, char* line, char delimiter) {
     line[0] = '\0';
     while (std::ferror(fp) == 0) {
         const int c = std::fgetc(fp); // an int: neither byte 0xFF nor an error is the end of the file
-        if (c == static_cast<unsigned char>(delimiter) || (c == EOF && std::feof(fp) != 0)) {
+        if (c == static_cast<unsigned char>(delimiter) || (c == EOF && std::feof(fp) != 0))
             return HEADER_READ;
-        }
-        if (c == EOF) {
+        if (c == EOF)
             continue;
-        }
-        if (length == LINE_CHARS - 1) {
+        if (length == LINE_CHARS - 1)
             return LINE_TOO_LONG;
-        }
         line[length] = static_cast<char>(c);
         line[++length] = '\0';
     }
@@ -78,17 +76,14 @@ ReadResult readPPMHeader(FILE* fp, PPMHeader* header) {
     header->fp = fp;
     ReadResult result = readEffectiveLine(fp, header->fmt);
     const bool isLongComment = result == LINE_TOO_LONG && detComment(header->fmt) != 0;
-    if (result != STREAM_ERROR && !isLongComment && std::strncmp(header->fmt, "P6", 2) != 0) {
+    if (result != STREAM_ERROR && !isLongComment && std::strncmp(header->fmt, "P6", 2) != 0)
         return WRONG_MAGIC;
-    }
-    if (result != HEADER_READ) {
+    if (result != HEADER_READ)
         return result;
-    }
     char wh[LINE_CHARS];
     result = readEffectiveLine(fp, wh);
-    if (result != HEADER_READ) {
+    if (result != HEADER_READ)
         return result;
-    }
     char* const space = std::strchr(wh, ' ');
     const char* h = "";
     if (space != nullptr) {
@@ -104,9 +99,8 @@ ReadResult readPPMHeader(FILE* fp, PPMHeader* header) {
 // The readers' way to the header: a stream error ends the process.
 bool isHeaderAccepted(FILE* fp, PPMHeader* header) {
     const ReadResult result = readPPMHeader(fp, header);
-    if (result == STREAM_ERROR) {
+    if (result == STREAM_ERROR)
         endProcess();
-    }
     return result == HEADER_READ;
 }
 
@@ -136,9 +130,8 @@ public:
     /// The next pixels, valid until the next call.
     /// @param pixels  at most so many, at least 1; receives how many there are, 1 or more
     const uint8_t* next(size_t& pixels) {
-        if (mEnd - mPosition < FILE_PIXEL_BYTES) {
+        if (mEnd - mPosition < FILE_PIXEL_BYTES)
             readPiece();
-        }
         pixels = std::min(pixels, (mEnd - mPosition) / FILE_PIXEL_BYTES);
         const uint8_t* const run = mBuffer.get() + mPosition;
         mPosition += pixels * FILE_PIXEL_BYTES;
@@ -179,9 +172,8 @@ public:
     PixelWriter(uint32_t bytesPerColour, bool isFp16, uint32_t shift)
         : mExpansion(bestRowExpansion()), mForm(formOf(bytesPerColour, isFp16, shift)) {
         const uint64_t left = uint64_t{shift} + 8 * (bytesPerColour - 1);
-        for (uint32_t sample = 0; sample < mShifted.size(); ++sample) {
+        for (uint32_t sample = 0; sample < mShifted.size(); ++sample)
             mShifted[sample] = left < 16 ? static_cast<uint16_t>(sample << left) : uint16_t{0};
-        }
     }
 
     void write(const uint8_t* rgb, unsigned char* out, size_t pixels) const {
@@ -205,9 +197,8 @@ private:
     enum class Form { BYTE, HALF, SHIFTED_BYTE, SHIFTED_WORD };
 
     static Form formOf(uint32_t bytesPerColour, bool isFp16, uint32_t shift) {
-        if (bytesPerColour == 1) {
+        if (bytesPerColour == 1)
             return shift == 0 ? Form::BYTE : Form::SHIFTED_BYTE;
-        }
         return isFp16 ? Form::HALF : Form::SHIFTED_WORD;
     }
 
@@ -237,12 +228,10 @@ bool isBufferLargeEnough(const Texture& tex) {
 int getLine(FILE* fp, char* str, char descripter) {
     char rest[LINE_CHARS];
     ReadResult result = readLine(fp, str, descripter);
-    while (result == LINE_TOO_LONG) {
+    while (result == LINE_TOO_LONG)
         result = readLine(fp, rest, descripter);
-    }
-    if (result == STREAM_ERROR) {
+    if (result == STREAM_ERROR)
         endProcess();
-    }
     return 0;
 }
 
@@ -260,9 +249,8 @@ int detComment(char* str) {
 int getWidthHeightFromPpmFile(std::string fname, uint32_t* width, uint32_t* height, uint32_t* bytePerCol) {
     const File file = openFile(fname);
     PPMHeader header;
-    if (!file || !isHeaderAccepted(file.get(), &header)) {
+    if (!file || !isHeaderAccepted(file.get(), &header))
         return -1;
-    }
     *width = header.width;
     *height = header.height;
     *bytePerCol = std::strcmp(header.bit, "65535") == 0 ? 2 : 1;
@@ -273,22 +261,19 @@ size_t fillBytesFromPpmFile(const std::string& fileName, Texture* tex, uint32_t 
                             uint32_t shift, bool isFp16) {
     const uint32_t bytesPerColour = tex->getBytesPerColour();
     unsigned char* const rows = tex->getAddress(texBufIndex);
-    if (rows == nullptr || (bytesPerColour != 1 && bytesPerColour != 2) || !isBufferLargeEnough(*tex)) {
+    if (rows == nullptr || (bytesPerColour != 1 && bytesPerColour != 2) || !isBufferLargeEnough(*tex))
         return 0;
-    }
     const File file = openFile(fileName);
     PPMHeader header;
     if (!file || !isHeaderAccepted(file.get(), &header) || header.width != tex->getWidth() ||
-        !isSizeAccepted(header)) {
+        !isSizeAccepted(header))
         return 0;
-    }
     const FieldRows field = tex->getIsInterlaced() ? fieldRows(fid) : EVERY_ROW;
     const uint32_t texRows = field.inFile(header.height, tex->getHeight());
     const uint32_t fileRows = texRows == 0 ? 0 : field.first + (texRows - 1) * field.step + 1;
     PixelStream stream(file.get(), uint64_t{fileRows} * header.width);
-    if (!stream.hasMemory()) {
+    if (!stream.hasMemory())
         return 0;
-    }
     const PixelWriter writer(bytesPerColour, isFp16, shift);
     const size_t pixelBytes = size_t{COMPONENTS} * bytesPerColour;
     const size_t pitch = pixelBytes * tex->getPitchInPix();
@@ -299,9 +284,8 @@ size_t fillBytesFromPpmFile(const std::string& fileName, Texture* tex, uint32_t 
         for (size_t x = 0; x < header.width; x += pixels) {
             pixels = header.width - x;
             const uint8_t* const rgb = stream.next(pixels);
-            if (isInField) {
+            if (isInField)
                 writer.write(rgb, row + pixelBytes * x, pixels);
-            }
         }
     }
     return pitch * texRows;
@@ -314,13 +298,12 @@ void fillTextureFromPpmFile(std::string filename, Texture* tex, uint32_t texBufI
 
 std::string refusalOfPpmFile(const std::string& fileName) {
     const File file = openFile(fileName);
-    if (!file) {
-        return std::string("it cannot be opened: ") + std::strerror(errno);
-    }
+    if (!file)
+        return notOpenedInWords(errno);
     PPMHeader header;
     switch (readPPMHeader(file.get(), &header)) {
     case STREAM_ERROR:
-        return std::string("it cannot be read: ") + std::strerror(errno);
+        return notReadInWords(errno);
     case WRONG_MAGIC:
         return "it does not start with P6, the sign of a binary PPM file";
     case LINE_TOO_LONG:
@@ -328,8 +311,7 @@ std::string refusalOfPpmFile(const std::string& fileName) {
     case HEADER_READ:
         break;
     }
-    if (!hasPixels(header)) {
+    if (!hasPixels(header))
         return "its header has no width and height, two numbers above 0 on a line with one space between";
-    }
     return isSizeAccepted(header) ? std::string() : tooLargeInWords(header.width, header.height);
 }

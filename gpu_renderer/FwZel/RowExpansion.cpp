@@ -79,9 +79,8 @@ FWZEL_AVX2 void rgbToRgbaAvx2(const uint8_t* rgb, unsigned char* rgba, size_t pi
     const auto expand = [rgb, rgba](size_t i) FWZEL_AVX2 {
         _mm256_storeu_si256(reinterpret_cast<__m256i*>(rgba + 4 * i), eightRgbaPixels(rgb + 3 * i));
     };
-    for (size_t i = 0; i + VECTOR_PIXELS <= pixels; i += VECTOR_PIXELS) {
+    for (size_t i = 0; i + VECTOR_PIXELS <= pixels; i += VECTOR_PIXELS)
         expand(i);
-    }
     expand(pixels - VECTOR_PIXELS);
 }
 
@@ -94,9 +93,8 @@ FWZEL_AVX2 void samplesToHalfF16c(const uint8_t* samples, unsigned char* out, si
         const __m128i eight = _mm_loadl_epi64(reinterpret_cast<const __m128i*>(samples + i));
         _mm_storeu_si128(reinterpret_cast<__m128i*>(out + 2 * i), eightHalves(eight));
     };
-    for (size_t i = 0; i + 8 <= count; i += 8) {
+    for (size_t i = 0; i + 8 <= count; i += 8)
         convert(i);
-    }
     convert(count - 8);
 }
 
@@ -115,9 +113,8 @@ FWZEL_AVX2 void rgbToHalfRgbaF16c(const uint8_t* rgb, unsigned char* rgba, size_
         _mm_storeu_si128(out + 2, eightHalves(high));
         _mm_storeu_si128(out + 3, eightHalves(_mm_unpackhi_epi64(high, high)));
     };
-    for (size_t i = 0; i + VECTOR_PIXELS <= pixels; i += VECTOR_PIXELS) {
+    for (size_t i = 0; i + VECTOR_PIXELS <= pixels; i += VECTOR_PIXELS)
         expand(i);
-    }
     expand(pixels - VECTOR_PIXELS);
 }
 
@@ -142,9 +139,8 @@ const RowExpansion& plainRowExpansion() {
 const RowExpansion& bestRowExpansion() {
 #if defined(__x86_64__)
     static constexpr RowExpansion AVX2 = {"avx2 f16c", rgbToRgbaAvx2, rgbToHalfRgbaF16c, samplesToHalfF16c};
-    if (__builtin_cpu_supports("avx2") && hasF16c()) {
+    if (__builtin_cpu_supports("avx2") && hasF16c())
         return AVX2;
-    }
 #endif
     return plainRowExpansion();
 }

@@ -2,7 +2,6 @@
 
 #include <FwZel/PictureFormat.h>
 #include <FwZel/PictureSize.h>
-#include <FwZel/PpmBytes.h>
 #include <FwZel/VideoTestImage.h>
 #include <FwZel/kxsys_syslog.h>
 
@@ -202,15 +201,16 @@ void Texture::createTextureForFile() {
     }
 }
 
-/// What the file does not deliver holds no stale memory. A PPM file fills the buffer from its start, so only
+/// What the file does not deliver holds no stale memory. Where a reader fills the buffer from its start, only
 /// the rest is cleared; a PNG file may stop in the middle of a pass over the picture.
 void Texture::fillHostBufFromFile(uint32_t buf_num) {
     const bool isFillable = fillFitsHostBuf(mNumBytesPerColour);
-    const bool isFilledFromStart = pictureFormat(mFileName) == PictureFormat::PPM;
+    const PictureFormat* const format = pictureFormat(mFileName);
+    const bool isFilledFromStart = format != nullptr && format->fillFromStart != nullptr;
     const uint32_t field = fieldOfBuffer(buf_num);
     size_t filled = 0;
     if (isFillable && isFilledFromStart)
-        filled = fillBytesFromPpmFile(mFileName, this, buf_num, field, 0, mIsFp16);
+        filled = format->fillFromStart(mFileName, this, buf_num, field, 0, mIsFp16);
     clearHostBuf(buf_num, filled);
     if (isFillable && !isFilledFromStart)
         VideoTestImage::fillTextureFile(mFileName, this, buf_num, field, 0, mIsFp16);
