@@ -27,8 +27,6 @@ public:
         mGuarded.reset();
     }
 
-    bool isUntouched() const { return hasNothingFrom(0, mGuarded.memory().size()); }
-
     /// Whether nothing was written but the first bytes of each row.
     bool isUntouchedBut(std::size_t rowBytes) const {
         const Texture& described = mGuarded.texture;
