@@ -1,6 +1,8 @@
 #ifndef CG_RUNTIME_PARAMETER_H
 #define CG_RUNTIME_PARAMETER_H
 
+#include "UniformType.h"
+
 #include <Cg/Compiler/Compiler.h>
 #include <Cg/cg.h>
 
@@ -21,8 +23,9 @@ struct ProgramParameter {
     ProgramParameter* next = nullptr; ///< the following one of the name space, or of the structure
     CGparameter handle = nullptr;     ///< null until the host asks for it
 
-    int location = -1;        ///< of the uniform; -1 where OpenGL has none
-    unsigned int glType = 0;  ///< the uniform's type as OpenGL's enumerant; of an array its elements'
+    int location = -1; ///< of the uniform; -1 where OpenGL has none
+    const UniformType* type =
+        nullptr;              ///< of the uniform, of an array its elements'; null where OpenGL has none
     int textureUnit = -1;     ///< of a sampler that the program uses, else -1
     unsigned int texture = 0; ///< of a sampler: OpenGL name
     bool hasTexture = false;  ///< the host has given the sampler a texture

@@ -5,8 +5,6 @@
 #include <epoxy/gl.h>
 
 #include <algorithm>
-#include <cmath>
-#include <limits>
 #include <string>
 #include <unordered_map>
 
@@ -47,65 +45,13 @@ GLenum typeOf(const std::string& name, const UniformTypes& types) {
 
 void findUniform(GLuint program, const UniformTypes& types, ProgramParameter& parameter) {
     const std::string& name = parameter.description.glslName;
-    parameter.glType = name.empty() ? 0 : typeOf(name, types);
-    if (parameter.glType != 0)
+    const GLenum type = name.empty() ? 0 : typeOf(name, types);
+    if (type != 0) {
+        parameter.type = &uniformType(type);
         parameter.location = glGetUniformLocation(program, name.c_str());
+    }
     for (ProgramParameter& child : parameter.children)
         findUniform(program, types, child);
-}
-
-bool isBool(GLenum type) {
-    return type == GL_BOOL || type == GL_BOOL_VEC2 || type == GL_BOOL_VEC3 || type == GL_BOOL_VEC4;
-}
-
-/// Towards zero; the nearest int where there is none, 0 for what is no number.
-GLint toInt(float value) {
-    if (std::isnan(value))
-        return 0;
-    constexpr float BEYOND = 2147483648.0F;
-    if (value >= BEYOND)
-        return std::numeric_limits<GLint>::max();
-    return value < -BEYOND ? std::numeric_limits<GLint>::min() : static_cast<GLint>(value);
-}
-
-std::vector<GLint> toInts(GLenum type, int count, const float* values) {
-    std::vector<GLint> ints(static_cast<size_t>(count) * static_cast<size_t>(valueCount(type)));
-    if (isBool(type))
-        std::transform(values, values + ints.size(), ints.begin(), [](float v) { return v != 0 ? 1 : 0; });
-    else
-        std::transform(values, values + ints.size(), ints.begin(), &toInt);
-    return ints;
-}
-
-void sendUnsigned(GLuint program, GLint location, GLenum type, int count, const float* values) {
-    const std::vector<GLint> ints = toInts(type, count, values);
-    const std::vector<GLuint> bits(ints.begin(), ints.end()); // a negative number wraps around, as in C
-    switch (valueCount(type)) {
-    case 1:
-        return glProgramUniform1uiv(program, location, count, bits.data());
-    case 2:
-        return glProgramUniform2uiv(program, location, count, bits.data());
-    case 3:
-        return glProgramUniform3uiv(program, location, count, bits.data());
-    default:
-        return glProgramUniform4uiv(program, location, count, bits.data());
-    }
-}
-
-void sendInts(GLuint program, GLint location, GLenum type, int count, const float* values) {
-    const std::vector<GLint> ints = toInts(type, count, values);
-    switch (valueCount(type)) {
-    case 1:
-        return glProgramUniform1iv(program, location, count, ints.data());
-    case 2:
-        return glProgramUniform2iv(program, location, count, ints.data());
-    case 3:
-        return glProgramUniform3iv(program, location, count, ints.data());
-    case 4:
-        return glProgramUniform4iv(program, location, count, ints.data());
-    default:
-        return;
-    }
 }
 
 bool hasValue(const std::vector<float>& defaults) {
@@ -120,87 +66,10 @@ void findUniforms(unsigned int glProgram, std::vector<ProgramParameter>& paramet
         findUniform(glProgram, types, parameter);
 }
 
-int valueCount(unsigned int glType) {
-    switch (glType) {
-    case GL_FLOAT:
-    case GL_INT:
-    case GL_UNSIGNED_INT:
-    case GL_BOOL:
-        return 1;
-    case GL_FLOAT_VEC2:
-    case GL_INT_VEC2:
-    case GL_UNSIGNED_INT_VEC2:
-    case GL_BOOL_VEC2:
-        return 2;
-    case GL_FLOAT_VEC3:
-    case GL_INT_VEC3:
-    case GL_UNSIGNED_INT_VEC3:
-    case GL_BOOL_VEC3:
-        return 3;
-    case GL_FLOAT_VEC4:
-    case GL_INT_VEC4:
-    case GL_UNSIGNED_INT_VEC4:
-    case GL_BOOL_VEC4:
-    case GL_FLOAT_MAT2:
-        return 4;
-    case GL_FLOAT_MAT2x3:
-    case GL_FLOAT_MAT3x2:
-        return 6;
-    case GL_FLOAT_MAT2x4:
-    case GL_FLOAT_MAT4x2:
-        return 8;
-    case GL_FLOAT_MAT3:
-        return 9;
-    case GL_FLOAT_MAT3x4:
-    case GL_FLOAT_MAT4x3:
-        return 12;
-    case GL_FLOAT_MAT4:
-        return 16;
-    default:
-        return 0;
-    }
-}
-
 void sendValues(const ProgramParameter& first, int count, const float* values, Layout layout) {
-    const GLuint program = first.program.glName();
-    const GLint location = first.location;
     // The rows of a Cg matrix are the columns of its GLSL matrix.
-    const GLboolean isTransposed = layout == Layout::COLUMN_BY_COLUMN ? GL_TRUE : GL_FALSE;
-    switch (first.glType) {
-    case GL_FLOAT:
-        return glProgramUniform1fv(program, location, count, values);
-    case GL_FLOAT_VEC2:
-        return glProgramUniform2fv(program, location, count, values);
-    case GL_FLOAT_VEC3:
-        return glProgramUniform3fv(program, location, count, values);
-    case GL_FLOAT_VEC4:
-        return glProgramUniform4fv(program, location, count, values);
-    case GL_FLOAT_MAT2:
-        return glProgramUniformMatrix2fv(program, location, count, isTransposed, values);
-    case GL_FLOAT_MAT3:
-        return glProgramUniformMatrix3fv(program, location, count, isTransposed, values);
-    case GL_FLOAT_MAT4:
-        return glProgramUniformMatrix4fv(program, location, count, isTransposed, values);
-    case GL_FLOAT_MAT2x3:
-        return glProgramUniformMatrix2x3fv(program, location, count, isTransposed, values);
-    case GL_FLOAT_MAT3x2:
-        return glProgramUniformMatrix3x2fv(program, location, count, isTransposed, values);
-    case GL_FLOAT_MAT2x4:
-        return glProgramUniformMatrix2x4fv(program, location, count, isTransposed, values);
-    case GL_FLOAT_MAT4x2:
-        return glProgramUniformMatrix4x2fv(program, location, count, isTransposed, values);
-    case GL_FLOAT_MAT3x4:
-        return glProgramUniformMatrix3x4fv(program, location, count, isTransposed, values);
-    case GL_FLOAT_MAT4x3:
-        return glProgramUniformMatrix4x3fv(program, location, count, isTransposed, values);
-    case GL_UNSIGNED_INT:
-    case GL_UNSIGNED_INT_VEC2:
-    case GL_UNSIGNED_INT_VEC3:
-    case GL_UNSIGNED_INT_VEC4:
-        return sendUnsigned(program, location, first.glType, count, values);
-    default:
-        return sendInts(program, location, first.glType, count, values);
-    }
+    first.type->send(
+        {first.program.glName(), first.location, count, values, layout == Layout::COLUMN_BY_COLUMN});
 }
 
 void sendDefaults(const std::vector<ProgramParameter>& parameters) {

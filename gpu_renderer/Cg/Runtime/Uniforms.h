@@ -12,12 +12,10 @@ void findUniforms(unsigned int glProgram, std::vector<ProgramParameter>& paramet
 
 enum class Layout { ROW_BY_ROW, COLUMN_BY_COLUMN };
 
-/// Number of values of a uniform of the type, 0 for a type that has none.
-int valueCount(unsigned int glType);
-
-/// Sends values for a uniform, or for elements of an array from this one on, in one OpenGL call.
+/// Sends values for a uniform that has a location, or for elements of an array from this one on, in one
+/// OpenGL call.
 /// @param count   number of elements
-/// @param values  count times valueCount() values
+/// @param values  count times type->floats values
 /// @param layout  how a matrix's values follow each other
 void sendValues(const ProgramParameter& first, int count, const float* values,
                 Layout layout = Layout::ROW_BY_ROW);

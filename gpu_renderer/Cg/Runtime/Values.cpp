@@ -33,7 +33,7 @@ void setVector(CGparameter handle, const float* values, int given) {
     const ProgramParameter* const parameter = cg::parameterOf(handle);
     if (!parameter || !accepts(*parameter, values) || parameter->location < 0)
         return;
-    if (given >= cg::valueCount(parameter->glType)) {
+    if (given >= parameter->type->floats) {
         cg::sendValues(*parameter, 1, values);
         return;
     }
@@ -74,7 +74,7 @@ void appendInnermost(const ProgramParameter& array, std::vector<const ProgramPar
 
 /// One OpenGL call.
 void sendElements(const ProgramParameter& first, long count, const float* values, int given, Layout layout) {
-    const int taken = cg::valueCount(first.glType);
+    const int taken = first.type->floats;
     if (given == taken) {
         cg::sendValues(first, static_cast<int>(count), values, layout);
         return;
