@@ -1,7 +1,5 @@
+#include <fixture/CgTest.h>
 #include <fixture/FloatCanvas.h>
-#include <fixture/GlTest.h>
-
-#include <Cg/cgGL.h>
 
 #include <epoxy/gl.h>
 
@@ -341,27 +339,17 @@ std::string objectionsTo(const std::string& glsl, const char* stage) {
     return status == 0 ? std::string() : text.str();
 }
 
-class CgPixels : public GlTest, public ::testing::WithParamInterface<std::string> {
+class CgPixels : public CgTest, public ::testing::WithParamInterface<std::string> {
 protected:
     void SetUp() override {
-        GlTest::SetUp();
-        if (IsSkipped() || HasFatalFailure())
-            return;
-        cgGetError();
-        mContext = cgCreateContext();
+        CgTest::SetUp();
         mCase = readCase(fs::path(FWZEL_CG_PROGRAMS) / (GetParam() + ".cg"));
     }
 
     void TearDown() override {
-        if (mContext) {
-            EXPECT_STREQ(cgGetErrorString(cgGetError()), "no error");
-            cgGLDisableProfile(CG_PROFILE_GLSLV);
-            cgGLDisableProfile(CG_PROFILE_GLSLF);
-            cgDestroyContext(mContext);
-        }
-        for (const GLuint texture : mTextures)
-            glDeleteTextures(1, &texture);
-        GlTest::TearDown();
+        if (!mTextures.empty())
+            glDeleteTextures(static_cast<GLsizei>(mTextures.size()), mTextures.data());
+        CgTest::TearDown();
     }
 
     /// Makes the program that draws a stage; none where the stage has no entry.
@@ -450,7 +438,6 @@ protected:
     }
 
     Case mCase;
-    CGcontext mContext = nullptr;
     std::vector<CGprogram> mPrograms;
     std::vector<GLuint> mTextures;
     std::vector<CGparameter> mSamplers;
