@@ -30,8 +30,9 @@ private:
     fs::path mPrevious;
 };
 
-fs::path folderWithCg() {
-    return (fs::read_symlink("/proc/self/exe").parent_path() / FWZEL_DATA_FOLDER).lexically_normal();
+fs::path pathOfOwn(const std::string& name) {
+    const fs::path folder = fs::read_symlink("/proc/self/exe").parent_path() / FWZEL_DATA_FOLDER;
+    return (folder / "Cg" / name).lexically_normal();
 }
 
 void throwIfUnreadable(const std::string& file) {
@@ -60,10 +61,18 @@ void throwIfCgFailed(const std::string& file, const std::string& entry) {
 } // namespace
 
 std::string cgProgramPath(const std::string& name) {
-    const fs::path path = folderWithCg() / "Cg" / name;
+    const fs::path path = pathOfOwn(name);
     if (!fs::exists(path))
         throw std::runtime_error(path.string() + ": the host's Cg program is not there");
     return path.string();
+}
+
+std::string findCgProgram(const std::string& file) {
+    std::error_code error;
+    if (fs::path(file).has_parent_path() || fs::exists(file, error))
+        return file;
+    const fs::path own = pathOfOwn(file);
+    return fs::exists(own, error) ? own.string() : file;
 }
 
 Shader makeDefaultVertexShader() {

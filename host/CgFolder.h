@@ -12,6 +12,10 @@ namespace host {
 /// @throw std::runtime_error  it is not there
 std::string cgProgramPath(const std::string& name);
 
+/// The file of a Cg program that a user names: one of the host's where there is no such file and the name has
+/// no folder, else the file itself.
+std::string findCgProgram(const std::string& file);
+
 /// The library's default vertex program. Shader asks for "Cg/vertex.cg" relative to the working directory;
 /// that is another one only meanwhile.
 /// @throw std::runtime_error  the program is not there or does not compile; what() says why

@@ -9,6 +9,7 @@
 
 #include <cmath>
 #include <cstdio>
+#include <filesystem>
 #include <fstream>
 #include <regex>
 #include <stdexcept>
@@ -215,6 +216,20 @@ TEST_F(ToolPlay, ThousandFramesTakeNoMoreMemoryThanAFew) {
     EXPECT_LT(memory[1] - memory[0], TOLERANCE) << "KiB, from " << memory[0];
 }
 
+TEST_F(ToolPlay, ProgramsOfTheHostAreFoundByNameWhereTheFolderHasNone) {
+    const std::string own = playRaw("colour-bar-75 " + host("ycbcr_to_rgb.cg")).output;
+    ASSERT_EQ(own.size(), FRAME_BYTES);
+    const TemporaryFile folder("folder");
+    std::filesystem::create_directory(folder.path());
+    const auto playThere = [&] {
+        return play("--size 72x50 --out - colour-bar-75 --program ycbcr_to_rgb.cg",
+                    "cd '" + folder.path() + "';");
+    };
+    EXPECT_TRUE(playThere().output == own);
+    std::ofstream(folder.path() + "/ycbcr_to_rgb.cg") << "float4 Cg_Main() : COLOR { return 1; }";
+    EXPECT_TRUE(playThere().output == std::string(FRAME_BYTES, '\xFF'));
+}
+
 struct Failure {
     const char* arguments;
     int exitCode;
@@ -229,6 +244,8 @@ TEST_F(ToolPlay, WhatFailsIsNamedWithTheReason) {
         {"nosuch", 2, "fwzel: \"nosuch\" is no pattern and no picture file"},
         {"/no/such.png", 1, "fwzel: /no/such.png: it cannot be opened: No such file or directory"},
         {"combi --program /no/such.cg", 1, "fwzel: /no/such.cg: No such file or directory"},
+        {"combi --program /no/texture.cg", 1, "fwzel: /no/texture.cg: No such file or directory"},
+        {"combi --program such.cg", 1, "fwzel: such.cg: No such file or directory"},
         {brokenProgram.c_str(), 1, listing.c_str()},
         {"combi --program '" FWZEL_HOST_CG "/texture.cg' --param gain=1", 2, "has no parameter gain\n"},
         {"combi --program '" FWZEL_HOST_CG "/colour.cg' --param colour=1", 2, "colour has 4 values, not 1\n"},

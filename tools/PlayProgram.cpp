@@ -20,8 +20,9 @@ constexpr size_t VECTOR_VALUES = 4;
 constexpr std::array<const char*, 3> OWN_PARAMETERS = {"pictureSize", "field", "frame"};
 
 Shader build(const PlayProgramSettings& settings) {
-    return settings.file.empty() ? host::makeFragmentShader(host::cgProgramPath("texture.cg"), "Cg_Main")
-                                 : host::makeFragmentShader(settings.file, settings.entry);
+    return settings.file.empty()
+               ? host::makeFragmentShader(host::cgProgramPath("texture.cg"), "Cg_Main")
+               : host::makeFragmentShader(host::findCgProgram(settings.file), settings.entry);
 }
 
 bool isSampler(CGparameter parameter) {

@@ -66,7 +66,7 @@ struct PlayParameter {
 
 /// A Cg fragment program of the user and what it is fed with; without a file, the host's own.
 struct PlayProgramSettings {
-    std::string file;
+    std::string file; ///< as it was named, see host::findCgProgram()
     std::string entry;
     std::vector<PlayParameter> parameters;
     std::vector<PlayAssignment> textures;

@@ -67,7 +67,9 @@ void addPictures(CLI::App& verb, PlayOptions& options) {
 }
 
 void addDrawing(CLI::App& verb, PlayOptions& options) {
-    verb.add_option("--program", options.program, "Cg file with the fragment program to draw pictures with")
+    verb.add_option("--program", options.program,
+                    "Cg file with the fragment program to draw pictures with, or the name of one that comes "
+                    "with fwzel")
         ->type_name("FILE");
     verb.add_option("--entry", options.entry, "Its entry function; default Cg_Main")->type_name("NAME");
     addRepeated(verb, "--param", options.parameters,
@@ -116,13 +118,14 @@ constexpr const char* FOOTER =
     "Corners and points are in the coordinates of the plane: x from -1 to 1 across, y upwards in the same "
     "unit.\n"
     "A program gets by itself, where it has them: the samplers picture (what the frame shows), even and odd\n"
-    "(its fields), float2 pictureSize, float field (0 even, 1 odd) and float frame. host/Cg has examples.\n"
+    "(its fields), float2 pictureSize, float field (0 even, 1 odd) and float frame.\n"
+    "Those that come with fwzel are in share/fwzel/Cg below where it is installed.\n"
     "Keys in the window: right and left arrow or n and b picture, f fields, h half floats, space pause,\n"
     "o stage times, return full screen, q quit.\n"
     "Examples:\n"
     "  fwzel play\n"
     "  fwzel play combi --fields --upload producer --frames 250 --out - --stats > combi.rgba\n"
-    "  fwzel play logo.png --program host/Cg/key_over_checkerboard.cg --param cell=32 --out logo_%d.png";
+    "  fwzel play logo.png --program key_over_checkerboard.cg --param cell=32 --out logo_%d.png";
 
 } // namespace
 
