@@ -57,16 +57,16 @@ int main(int argc, char** argv) try {
     fragment.addCgParam("colour", 4, 1, 1, 0.8F, 0, 1);
     fragment.addCgParam("amount", 1, 1, 0.4F, 0, 0, 0);
     for (Shader* const shader : {&vertex, &fragment}) {
-        shader->getNamedCgParameterAll();
+        shader->getNamedCgParameterAll(); // looks the names up in the program
         shader->setCgParamAll();
         shader->bindProgram();
         shader->enableProfile();
     }
     VertexListPlane plane(1, 1, 1.0F, &fragment);
     plane.render();
+    fragment.setCgParam("amount", 1, 0, 0, 0);
     VertexListBox box(&fragment, -1, 1, -1, 1);
     box.setLineWidth(5);
-    fragment.setCgParam("amount", 1, 0, 0, 0);
     box.render();
     vertex.disableProfile();
     fragment.disableProfile();

@@ -10,6 +10,8 @@
 #include <cstdio>
 #include <fstream>
 #include <iterator>
+#include <regex>
+#include <vector>
 
 namespace {
 
@@ -106,9 +108,25 @@ TEST_F(Examples, WhatCannotBeDoneIsNamed) {
     }
 }
 
-TEST(ExamplesInReadme, SmallestHostIsTheOneThatIsBuilt) {
-    const std::string quote = "```cpp\n" + textOf(FWZEL_EXAMPLES "/smallest_host.cpp") + "```\n";
-    EXPECT_NE(textOf(FWZEL_EXAMPLES "/../README.md").find(quote), std::string::npos);
+/// The README's blocks of C++.
+std::vector<std::string> quotedCode() {
+    const std::string begin = "```cpp\n";
+    const std::string end = "```\n";
+    const std::string text = textOf(FWZEL_EXAMPLES "/../README.md");
+    std::vector<std::string> blocks;
+    for (size_t at = text.find(begin); at != std::string::npos; at = text.find(begin, at)) {
+        at += begin.size();
+        blocks.push_back(text.substr(at, text.find(end, at) - at));
+    }
+    return blocks;
+}
+
+TEST(ExamplesInReadme, AreThoseThatAreBuilt) {
+    const std::vector<std::string> quoted = quotedCode();
+    ASSERT_EQ(quoted.size(), 2U);
+    EXPECT_EQ(quoted[0], textOf(FWZEL_EXAMPLES "/smallest_host.cpp"));
+    const std::string indented = std::regex_replace("\n" + quoted[1], std::regex("\n(?=.)"), "\n    ");
+    EXPECT_NE(textOf(FWZEL_EXAMPLES "/cg_parameters.cpp").find(indented), std::string::npos) << indented;
 }
 
 } // namespace
