@@ -84,7 +84,7 @@ public:
     ParameterLister(const References& references, GlslEmitter& emitter)
         : mReferences(references), mEmitter(emitter) {}
 
-    Parameter list(const ProgramParameter& source) {
+    Parameter list(const TypedParameter& source) {
         Parameter parameter;
         parameter.name = std::string(source.name);
         parameter.semantic = std::string(source.semantic);
@@ -234,7 +234,7 @@ std::vector<Parameter> listParameters(const TypedProgram& program, const Referen
                                       GlslEmitter& emitter) {
     ParameterLister lister(references, emitter);
     std::vector<Parameter> parameters;
-    for (const ProgramParameter& source : program.parameters)
+    for (const TypedParameter& source : program.parameters)
         parameters.push_back(lister.list(source));
     return parameters;
 }

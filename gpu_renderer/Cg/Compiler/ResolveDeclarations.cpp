@@ -588,7 +588,7 @@ void Resolver::resolveEntry(const FunctionDecl* declaration) {
                                "parameter " + inQuotes(parameter->name) + " of the entry needs a known size");
             continue;
         }
-        ProgramParameter listed;
+        TypedParameter listed;
         listed.name = parameter->name;
         listed.type = type;
         listed.semantic = parameter->semantic.name;
@@ -625,7 +625,7 @@ void Resolver::resolveEntry(const FunctionDecl* declaration) {
         if (semantic.empty() && !function->result->isStruct())
             semantic = mStage == Stage::VERTEX ? "POSITION" : "COLOR";
         addStageValues(mBuild.variable(at, mProgram->result), semantic, "result", true);
-        ProgramParameter listed;
+        TypedParameter listed;
         listed.name = "return";
         listed.type = function->result;
         listed.semantic = declaration->semantic.name;
@@ -688,7 +688,7 @@ void Resolver::addGlobals() {
         const Variable* known = globalVariable(variableDecl);
         if (!known || known->storage != Variable::Storage::UNIFORM)
             continue;
-        ProgramParameter listed;
+        TypedParameter listed;
         listed.name = variableDecl->name;
         listed.type = known->type;
         listed.semantic = variableDecl->semantic.name;

@@ -139,7 +139,7 @@ struct StageValue {
 };
 
 /// A parameter of the program as the runtime sees it.
-struct ProgramParameter {
+struct TypedParameter {
     Name name;
     const Type* type = nullptr;
     Name semantic;
@@ -150,7 +150,7 @@ struct ProgramParameter {
 };
 
 struct TypedProgram {
-    std::vector<ProgramParameter> parameters; ///< the entry's, its result as "return", the globals
+    std::vector<TypedParameter> parameters; ///< the entry's, its result as "return", the globals
 
     std::vector<Variable*> uniforms;    ///< those that the entry reaches
     std::vector<Variable*> globals;     ///< in the order of their initialization
