@@ -5,6 +5,7 @@
 #include <Cg/Compiler/Types.h>
 
 #include <array>
+#include <cstddef>
 #include <cstdint>
 #include <map>
 #include <string>
@@ -91,6 +92,24 @@ struct TypedExpr {
     /// A literal without a suffix, or arithmetic of such ones: takes the scalar kind of its partner.
     bool isUntyped = false;
 };
+
+/// It can be written twice in the GLSL text: no side effect and nothing worth computing once.
+bool isSimple(const TypedExpr* expression);
+
+/// Its evaluation may change something.
+bool hasEffect(const TypedExpr* expression);
+
+/// The variable that an l-value is a part of, or null.
+Variable* rootVariable(const TypedExpr* expression);
+
+/// What `c ? a : b` may be, where that is a sampler; a single one else.
+std::vector<TypedExpr*> samplersIn(TypedExpr* sampler);
+
+/// Samplers that one look-up may choose among.
+constexpr std::size_t MAX_SAMPLER_CHOICES = 64;
+
+/// How an operator is written, in Cg and in GLSL.
+const char* spelling(BinaryOp op);
 
 struct TypedStmt {
     enum class Kind {

@@ -62,6 +62,24 @@ bool isSize(char c) {
     return c >= '1' && c <= '4';
 }
 
+/// The sampler that compares no depth.
+Sampler withoutDepth(Sampler sampler) {
+    switch (sampler) {
+    case Sampler::D1_SHADOW:
+        return Sampler::D1;
+    case Sampler::D2_SHADOW:
+        return Sampler::D2;
+    case Sampler::RECT_SHADOW:
+        return Sampler::RECT;
+    case Sampler::CUBE_SHADOW:
+        return Sampler::CUBE;
+    case Sampler::D2_ARRAY_SHADOW:
+        return Sampler::D2_ARRAY;
+    default:
+        return sampler;
+    }
+}
+
 } // namespace
 
 int StructType::find(Name field) const {
@@ -228,6 +246,10 @@ std::string nameOf(const Type* type) {
 
 bool isDepthSampler(Sampler sampler) {
     return sampler >= Sampler::D1_SHADOW;
+}
+
+bool areSameTexture(Sampler a, Sampler b) {
+    return a == Sampler::ANY || b == Sampler::ANY || withoutDepth(a) == withoutDepth(b);
 }
 
 bool containsSampler(const Type* type) {

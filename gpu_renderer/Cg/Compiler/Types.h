@@ -67,6 +67,7 @@ struct Type {
 
     /// A matrix with one row or one column is a vector in GLSL, which has no such matrices.
     bool isThinMatrix() const { return isMatrix() && (rows == 1 || columns == 1); }
+    bool isFullMatrix() const { return isMatrix() && !isThinMatrix(); }
 };
 
 struct Field {
@@ -145,6 +146,9 @@ const char* nameOf(Scalar scalar);
 bool containsSampler(const Type* type);
 
 bool isDepthSampler(Sampler sampler); ///< one whose look-ups compare a depth
+
+/// Samplers of one texture's kind, whether they compare a depth or not; ANY is like all of them.
+bool areSameTexture(Sampler a, Sampler b);
 
 /// A sampler or an array of samplers: nothing that a GLSL struct of ours holds.
 bool isOpaque(const Type* type);
