@@ -3,7 +3,6 @@
 
 #include <Cg/Compiler/Types.h>
 
-#include <string>
 #include <vector>
 
 /// Cg's standard library as a table: what each function takes, and what it is in GLSL.
@@ -57,15 +56,6 @@ BuiltinLookup findBuiltin(Name name);
 
 /// Names of all built-in functions, for "did you mean".
 std::vector<Name> builtinNames();
-
-struct HelperFunction {
-    std::string text; ///< its GLSL definition; equal texts are one function
-    Name needs;       ///< name of the helper that it calls (for scalars), or empty
-};
-
-/// A helper function that a built-in's GLSL form calls.
-/// @param type  GLSL type of its first operand: `float` to `vec4`, the same of ints or bools, or `mat2x3`
-HelperFunction findHelper(Name name, const std::string& type);
 
 } // namespace cg
 

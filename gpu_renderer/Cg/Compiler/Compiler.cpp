@@ -4,6 +4,7 @@
 #include <Cg/Compiler/Diagnostics.h>
 #include <Cg/Compiler/FlatBranches.h>
 #include <Cg/Compiler/GlslEmitter.h>
+#include <Cg/Compiler/GlslSymbols.h>
 #include <Cg/Compiler/ParameterList.h>
 #include <Cg/Compiler/Parser.h>
 #include <Cg/Compiler/Preprocessor.h>
@@ -73,9 +74,9 @@ void translate(const CompileRequest& request, SourceFiles& files, Diagnostics& d
         return;
     flattenBranches(*program, types, arena);
     const References references(*program);
-    GlslEmitter emitter(*program, types, interface, references);
-    result.glsl = emitter.emit();
-    result.parameters = listParameters(*program, references, emitter);
+    GlslSymbols symbols(*program, interface, references);
+    result.glsl = GlslEmitter(*program, types, interface, symbols).emit();
+    result.parameters = listParameters(*program, references, symbols);
     result.ok = true;
 }
 

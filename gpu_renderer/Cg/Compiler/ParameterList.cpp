@@ -1,7 +1,7 @@
 #include <Cg/Compiler/ParameterList.h>
 
 #include <Cg/Compiler/ConstantFolding.h>
-#include <Cg/Compiler/GlslEmitter.h>
+#include <Cg/Compiler/GlslSymbols.h>
 #include <Cg/Compiler/References.h>
 
 #include <cctype>
@@ -81,8 +81,8 @@ struct Place {
 
 class ParameterLister {
 public:
-    ParameterLister(const References& references, GlslEmitter& emitter)
-        : mReferences(references), mEmitter(emitter) {}
+    ParameterLister(const References& references, GlslSymbols& symbols)
+        : mReferences(references), mSymbols(symbols) {}
 
     Parameter list(const TypedParameter& source) {
         Parameter parameter;
@@ -101,7 +101,7 @@ public:
         Place place;
         place.variable = source.variable;
         if (source.isUniform && !source.variable->state)
-            place.glslName = mEmitter.nameOfVariable(source.variable);
+            place.glslName = mSymbols.uniformName(source.variable);
         if (source.isUniform && source.variable->state)
             parameter.stateBinding = parameter.semantic;
         const Type* type = source.isUniform ? source.variable->type : source.type;
@@ -159,7 +159,7 @@ private:
         const auto piece = place.variable->samplers.find(place.memberPath);
         if (piece == place.variable->samplers.end())
             return;
-        parameter.glslName = mEmitter.nameOfVariable(piece->second);
+        parameter.glslName = mSymbols.uniformName(piece->second);
         if (place.isInArray && !parameter.glslName.empty())
             parameter.glslName += "[" + std::to_string(place.samplerIndex) + "]";
     }
@@ -175,7 +175,7 @@ private:
             Place memberPlace = place;
             memberPlace.memberPath += "." + std::string(field.name);
             if (!place.glslName.empty() && !isOpaque(field.type))
-                memberPlace.glslName += "." + mEmitter.memberName(structure, i);
+                memberPlace.glslName += "." + mSymbols.memberName(structure, i);
             describe(member, field.type, memberPlace);
             parameter.children.push_back(std::move(member));
         }
@@ -222,7 +222,7 @@ private:
     }
 
     const References& mReferences;
-    GlslEmitter& mEmitter;
+    GlslSymbols& mSymbols;
     std::optional<std::vector<double>> mDefaults;
     std::size_t mNextDefault = 0;
     std::size_t mCount = 0;
@@ -231,8 +231,8 @@ private:
 } // namespace
 
 std::vector<Parameter> listParameters(const TypedProgram& program, const References& references,
-                                      GlslEmitter& emitter) {
-    ParameterLister lister(references, emitter);
+                                      GlslSymbols& symbols) {
+    ParameterLister lister(references, symbols);
     std::vector<Parameter> parameters;
     for (const TypedParameter& source : program.parameters)
         parameters.push_back(lister.list(source));

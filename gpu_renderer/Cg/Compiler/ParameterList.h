@@ -8,13 +8,13 @@
 
 namespace cg {
 
-class GlslEmitter;
+class GlslSymbols;
 class References;
 
 /// The program's parameters as the runtime shows them.
-/// @param emitter  after emit(): knows the GLSL names
+/// @param symbols  after the shader was written: knows the GLSL names
 std::vector<Parameter> listParameters(const TypedProgram& program, const References& references,
-                                      GlslEmitter& emitter);
+                                      GlslSymbols& symbols);
 
 } // namespace cg
 

@@ -252,16 +252,26 @@ bool areSameTexture(Sampler a, Sampler b) {
     return a == Sampler::ANY || b == Sampler::ANY || withoutDepth(a) == withoutDepth(b);
 }
 
-bool containsSampler(const Type* type) {
+const Type* innermost(const Type* type) {
     while (type->isArray())
         type = type->element;
+    return type;
+}
+
+int flatLength(const Type* type) {
+    int length = 1;
+    for (; type->isArray(); type = type->element)
+        length *= type->length;
+    return length;
+}
+
+bool containsSampler(const Type* type) {
+    type = innermost(type);
     return type->isSampler() || (type->isStruct() && type->structure->hasSamplers);
 }
 
 bool isOpaque(const Type* type) {
-    while (type->isArray())
-        type = type->element;
-    return type->isSampler();
+    return innermost(type)->isSampler();
 }
 
 int countLeaves(const Type* type, int limit) {

@@ -143,6 +143,12 @@ std::string nameOf(const Type* type);
 /// @return the scalar kind's name: `half`
 const char* nameOf(Scalar scalar);
 
+/// What an array holds at last, within arrays of arrays; another type itself.
+const Type* innermost(const Type* type);
+
+/// Elements of an array, those of arrays within it counted singly: GLSL's arrays are flat. 1 for other types.
+int flatLength(const Type* type);
+
 bool containsSampler(const Type* type);
 
 bool isDepthSampler(Sampler sampler); ///< one whose look-ups compare a depth
