@@ -218,14 +218,13 @@ private:
         if (!left->type->isNumeric() || !right->type->isNumeric() || !expression->type->isNumeric())
             return std::nullopt;
         const bool isMatrixProduct = expression->binary == BinaryOp::MULTIPLY &&
-                                     left->type->isMatrix() != right->type->isMatrix() &&
+                                     (left->type->isMatrix() || right->type->isMatrix()) &&
                                      !left->type->isScalar() && !right->type->isScalar();
-        const bool isComma = expression->binary == BinaryOp::COMMA;
+        if (isMatrixProduct || expression->binary == BinaryOp::COMMA)
+            return std::nullopt;
         const MaybeValues a = evaluate(left);
         const MaybeValues b = evaluate(right);
-        const bool areMatrices = left->type->isMatrix() && right->type->isMatrix();
-        if (!a || !b || isMatrixProduct || isComma ||
-            (areMatrices && expression->binary == BinaryOp::MULTIPLY))
+        if (!a || !b)
             return std::nullopt;
         const std::size_t count = std::max(a->size(), b->size());
         Values values;
@@ -275,7 +274,7 @@ private:
             return values;
         if (from->isScalar())
             values->resize(static_cast<std::size_t>(componentsOf(to)), (*values)[0]);
-        if (from->isMatrix() && to->isMatrix() && !from->isThinMatrix() && !to->isThinMatrix()) {
+        if (from->isFullMatrix() && to->isFullMatrix()) {
             Values cut;
             for (int row = 0; row < to->rows; ++row)
                 for (int column = 0; column < to->columns; ++column)

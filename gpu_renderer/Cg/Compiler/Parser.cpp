@@ -99,6 +99,26 @@ private:
         refuse(brace.location, "this '{' is never closed");
     }
 
+    /// What stands between braces, from the `{` to behind the `}`. A fault ends one piece of it, not all.
+    /// @param what   "to begin a block", to follow the `{` that is expected
+    /// @param place  of the pieces
+    template <class ParsePiece>
+    void parseBraced(const char* what, Place place, const ParsePiece& parsePiece) {
+        const Token opening = token();
+        expect(TokenKind::LEFT_BRACE, what);
+        while (!isAt(TokenKind::RIGHT_BRACE)) {
+            if (isAt(TokenKind::END))
+                refuseUnclosed(opening);
+            const std::size_t start = mAt;
+            try {
+                parsePiece();
+            } catch (const SyntaxError&) {
+                recover(start, place);
+            }
+        }
+        pass();
+    }
+
     // ------------------------------------------------------------------------------------ declarations
 
     void parseTopLevel(std::vector<Decl*>& declarations) {
@@ -122,11 +142,16 @@ private:
             parseDeclaration(declarations, Place::GLOBAL);
     }
 
+    /// Behind this word and the name that it may have there is a `{` or what may stand before that.
+    bool isFollowedByBraces(TokenKind between) const {
+        const std::size_t behindName = isAt(TokenKind::NAME, 1) ? 2 : 1;
+        return isAt(TokenKind::LEFT_BRACE, behindName) || isAt(between, behindName);
+    }
+
     bool isAtConstantBuffer() const {
         if ((!isAtWord("cbuffer") && !isAtWord("tbuffer")) || mScopes.isDeclared(token().text))
             return false;
-        const std::size_t behindName = isAt(TokenKind::NAME, 1) ? 2 : 1;
-        return isAt(TokenKind::LEFT_BRACE, behindName) || isAt(TokenKind::COLON, behindName);
+        return isFollowedByBraces(TokenKind::COLON);
     }
 
     /// `cbuffer Frame : register(b0) { float4 tint; };` declares what is in it, each by itself.
@@ -138,20 +163,10 @@ private:
             Semantic ignored;
             parseSemantic(ignored);
         }
-        const Token opening = token();
-        expect(TokenKind::LEFT_BRACE, "to begin a buffer's constants");
-        while (!isAt(TokenKind::RIGHT_BRACE)) {
-            if (isAt(TokenKind::END))
-                refuseUnclosed(opening);
-            const std::size_t start = mAt;
-            try {
-                if (!take(TokenKind::SEMICOLON))
-                    parseDeclaration(declarations, Place::GLOBAL);
-            } catch (const SyntaxError&) {
-                recover(start, Place::MEMBER);
-            }
-        }
-        pass();
+        parseBraced("to begin a buffer's constants", Place::MEMBER, [&] {
+            if (!take(TokenKind::SEMICOLON))
+                parseDeclaration(declarations, Place::GLOBAL);
+        });
     }
 
     bool isAtAssembly() const {
@@ -165,8 +180,7 @@ private:
     bool isAtEffectBlock() const {
         if (!isAt(TokenKind::NAME) || !isEffectBlock(token().text))
             return false;
-        const std::size_t behindName = isAt(TokenKind::NAME, 1) ? 2 : 1;
-        return isAt(TokenKind::LEFT_BRACE, behindName) || isAt(TokenKind::LESS, behindName);
+        return isFollowedByBraces(TokenKind::LESS);
     }
 
     void skipEffectBlock() {
@@ -309,8 +323,7 @@ private:
     bool isAtStructDefinition() const {
         if (!isAtWord("struct") && (!isAtWord("class") || mScopes.isDeclared("class")))
             return false;
-        const std::size_t behindName = isAt(TokenKind::NAME, 1) ? 2 : 1;
-        return isAt(TokenKind::LEFT_BRACE, behindName) || isAt(TokenKind::COLON, behindName);
+        return isFollowedByBraces(TokenKind::COLON);
     }
 
     /// `struct Light;` and `interface Lit;`, which promise a definition.
@@ -343,20 +356,8 @@ private:
         mScopes.declareType(definition->name);
         if (take(TokenKind::COLON))
             definition->baseName = expectName("a base's name after ':'").text;
-        const Token opening = token();
-        expect(TokenKind::LEFT_BRACE, "to begin a struct's members");
         const NameScopes::Scope scope(mScopes);
-        while (!isAt(TokenKind::RIGHT_BRACE)) {
-            if (isAt(TokenKind::END))
-                refuseUnclosed(opening);
-            const std::size_t start = mAt;
-            try {
-                parseMember(*definition);
-            } catch (const SyntaxError&) {
-                recover(start, Place::MEMBER);
-            }
-        }
-        pass();
+        parseBraced("to begin a struct's members", Place::MEMBER, [&] { parseMember(*definition); });
         return definition;
     }
 
@@ -526,22 +527,12 @@ private:
 
     BlockStmt* parseBlock() {
         const Level level(*this);
-        const Token opening = token();
-        auto* const block = make<BlockStmt>(opening.location);
-        expect(TokenKind::LEFT_BRACE, "to begin a block");
+        auto* const block = make<BlockStmt>(token().location);
         const NameScopes::Scope scope(mScopes);
-        while (!isAt(TokenKind::RIGHT_BRACE)) {
-            if (isAt(TokenKind::END))
-                refuseUnclosed(opening);
-            const std::size_t start = mAt;
-            try {
-                if (Stmt* const statement = parseStatement())
-                    block->statements.push_back(statement);
-            } catch (const SyntaxError&) {
-                recover(start, Place::LOCAL);
-            }
-        }
-        pass();
+        parseBraced("to begin a block", Place::LOCAL, [&] {
+            if (Stmt* const statement = parseStatement())
+                block->statements.push_back(statement);
+        });
         return block;
     }
 
@@ -731,24 +722,20 @@ private:
         return statement;
     }
 
-    Stmt* parseReturn() {
-        auto* const statement = make<JumpStmt>(Stmt::Kind::RETURN, token().location);
-        pass();
-        if (!isAt(TokenKind::SEMICOLON))
-            statement->value = parseExpression();
-        expect(TokenKind::SEMICOLON, "after 'return'");
-        return statement;
-    }
+    Stmt* parseReturn() { return parseJump(Stmt::Kind::RETURN, "after 'return'"); }
 
     /// `discard;`, `discard condition;`, `discard();`
-    Stmt* parseDiscard() {
-        auto* const statement = make<JumpStmt>(Stmt::Kind::DISCARD, token().location);
+    Stmt* parseDiscard() { return parseJump(Stmt::Kind::DISCARD, "after 'discard'"); }
+
+    Stmt* parseJump(Stmt::Kind kind, const char* where) {
+        auto* const statement = make<JumpStmt>(kind, token().location);
         pass();
-        if (isAt(TokenKind::LEFT_PAREN) && isAt(TokenKind::RIGHT_PAREN, 1))
+        const bool isEmptyCall = isAt(TokenKind::LEFT_PAREN) && isAt(TokenKind::RIGHT_PAREN, 1);
+        if (kind == Stmt::Kind::DISCARD && isEmptyCall)
             skipBracketed();
         else if (!isAt(TokenKind::SEMICOLON))
             statement->value = parseExpression();
-        expect(TokenKind::SEMICOLON, "after 'discard'");
+        expect(TokenKind::SEMICOLON, where);
         return statement;
     }
 
