@@ -1,17 +1,13 @@
+#include <fixture/FileText.h>
+#include <fixture/GlslJudge.h>
+
 #include <Cg/Compiler/Compiler.h>
 
 #include <gtest/gtest.h>
 
-#include <sys/wait.h>
-
-#include <array>
-#include <cstdio>
-#include <cstdlib>
 #include <filesystem>
-#include <fstream>
 #include <sstream>
 #include <string>
-#include <string_view>
 #include <vector>
 
 // Programs are data: every file under tests/cg/ names its entries in lines `//! vertex NAME` and
@@ -20,14 +16,6 @@
 namespace {
 
 namespace fs = std::filesystem;
-
-std::string textOf(const fs::path& path) {
-    std::ifstream file(path, std::ios::binary);
-    EXPECT_TRUE(file) << "cannot open " << path;
-    std::ostringstream text;
-    text << file.rdbuf();
-    return text.str();
-}
 
 struct Entry {
     cg::Stage stage;
@@ -58,7 +46,7 @@ cg::CompileResult compile(const std::string& source, const std::string& fileName
     request.reader = [](const std::string& path, std::string& text) {
         if (!fs::is_regular_file(path))
             return false;
-        text = textOf(path);
+        text = fileText(path);
         return true;
     };
     return cg::compile(request);
@@ -66,23 +54,6 @@ cg::CompileResult compile(const std::string& source, const std::string& fileName
 
 cg::CompileResult compileFragment(const std::string& source) {
     return compile(source, "test.cg", {cg::Stage::FRAGMENT, "main"});
-}
-
-/// What glslangValidator finds wrong with a shader; empty where it is right and, outside CI, where there is
-/// no judge.
-std::string verdict(const std::string& glsl, cg::Stage stage) {
-    if (std::string_view(FWZEL_GLSLANG_VALIDATOR).empty())
-        return std::getenv("CI") ? "glslangValidator is not there" : "";
-    const fs::path file =
-        fs::path(testing::TempDir()) / (stage == cg::Stage::VERTEX ? "judged.vert" : "judged.frag");
-    std::ofstream(file) << glsl;
-    const std::string command = FWZEL_GLSLANG_VALIDATOR " " + file.string();
-    FILE* pipe = popen(command.c_str(), "r");
-    std::string output;
-    std::array<char, 512> part{};
-    while (std::fgets(part.data(), static_cast<int>(part.size()), pipe))
-        output += part.data();
-    return WEXITSTATUS(pclose(pipe)) == 0 ? "" : output;
 }
 
 std::vector<std::string> programsIn(const char* folder) {
@@ -101,13 +72,14 @@ class CgPrograms : public testing::TestWithParam<std::string> {};
 
 TEST_P(CgPrograms, BecomeGlslThatASecondJudgeTakes) {
     const fs::path path = fs::path(FWZEL_CG_PROGRAMS) / (GetParam() + ".cg");
-    const std::string source = textOf(path);
+    const std::string source = fileText(path);
     const std::vector<Entry> entries = entriesOf(source);
     ASSERT_FALSE(entries.empty());
     for (const Entry& entry : entries) {
         const cg::CompileResult result = compile(source, path.string(), entry);
         ASSERT_TRUE(result.ok) << result.listing;
-        EXPECT_EQ("", verdict(result.glsl, entry.stage)) << result.glsl;
+        EXPECT_EQ("", objectionsTo(result.glsl, entry.stage == cg::Stage::VERTEX ? "vert" : "frag"))
+            << result.glsl;
     }
 }
 
@@ -117,9 +89,9 @@ class CgErrors : public testing::TestWithParam<std::string> {};
 
 TEST_P(CgErrors, AreListedWithTheirPlaces) {
     const fs::path program = fs::path(FWZEL_CG_PROGRAMS) / (GetParam() + ".cg");
-    const std::string source = textOf(program);
+    const std::string source = fileText(program);
     const cg::CompileResult result = compile(source, program.filename().string(), entriesOf(source).at(0));
-    EXPECT_EQ(textOf(fs::path(program).replace_extension(".listing")), result.listing);
+    EXPECT_EQ(fileText(fs::path(program).replace_extension(".listing").string()), result.listing);
     const bool isWrong = result.listing.find(" : error: ") != std::string::npos;
     EXPECT_EQ(!isWrong, result.ok);
     EXPECT_EQ(isWrong, result.glsl.empty());

@@ -1,13 +1,12 @@
 #include <fixture/CgTest.h>
 #include <fixture/FloatCanvas.h>
+#include <fixture/GlslJudge.h>
 
 #include <epoxy/gl.h>
 
-#include <unistd.h>
-
 #include <algorithm>
+#include <array>
 #include <cmath>
-#include <cstdlib>
 #include <filesystem>
 #include <fstream>
 #include <functional>
@@ -320,23 +319,6 @@ GLuint makeTexture(GLenum target, const TextureSetting& from, bool isLinear) {
                      GL_FLOAT, texels);
     glBindTexture(target, 0);
     return texture;
-}
-
-/// What glslangValidator says against a text, empty where it takes it or, outside CI, is not there.
-std::string objectionsTo(const std::string& glsl, const char* stage) {
-    if (std::string(FWZEL_GLSLANG_VALIDATOR).empty())
-        return std::getenv("CI") ? "glslangValidator is not there" : "";
-    const fs::path file = fs::temp_directory_path() / ("fwzel-" + std::to_string(::getpid()) + '.' + stage);
-    const fs::path said = file.string() + ".txt";
-    std::ofstream(file) << glsl;
-    const std::string command =
-        std::string(FWZEL_GLSLANG_VALIDATOR) + ' ' + file.string() + " > " + said.string() + " 2>&1";
-    const int status = std::system(command.c_str());
-    std::ostringstream text;
-    text << std::ifstream(said).rdbuf();
-    fs::remove(file);
-    fs::remove(said);
-    return status == 0 ? std::string() : text.str();
 }
 
 class CgPixels : public CgTest, public ::testing::WithParamInterface<std::string> {

@@ -1,13 +1,14 @@
 #include <fixture/CgTest.h>
 #include <fixture/FloatCanvas.h>
 #include <fixture/SwappedEntryPoint.h>
+#include <fixture/TemporaryFile.h>
 
-#include <cstdio>
-#include <fstream>
 #include <functional>
 #include <random>
 #include <set>
+#include <sstream>
 #include <string>
+#include <utility>
 #include <vector>
 
 namespace {
@@ -68,23 +69,6 @@ Vertex fetchIt(float4 position : POSITION, uniform sampler2D picture)
     return vertex;
 }
 )";
-
-/// A file that exists while the object does.
-class SourceFile {
-public:
-    SourceFile(std::string path, const std::string& text) : mPath(std::move(path)) {
-        std::ofstream(mPath) << text;
-    }
-    ~SourceFile() { std::remove(mPath.c_str()); }
-
-    SourceFile(const SourceFile&) = delete;
-    SourceFile& operator=(const SourceFile&) = delete;
-
-    const char* path() const { return mPath.c_str(); }
-
-private:
-    std::string mPath;
-};
 
 GLuint solidTexture(const Pixel& colour) {
     GLuint texture = 0;
@@ -221,7 +205,8 @@ TEST_F(CgRuntime, AnInvalidHandleSetsTheErrorAndDoesNothing) {
 }
 
 TEST_F(CgRuntime, WhatDoesNotCompileIsNullWithAListing) {
-    const SourceFile file("broken.cg", "float4 main() : COLOR\n{\n    return missing;\n}\n");
+    const TemporaryFile broken("broken.cg", bytesOf("float4 main() : COLOR\n{\n    return missing;\n}\n"));
+    const std::string place = broken.path() + "(3) : error: ";
     struct Case {
         const char* file;
         const char* entry;
@@ -230,8 +215,8 @@ TEST_F(CgRuntime, WhatDoesNotCompileIsNullWithAListing) {
         const char* listing;
     };
     const std::vector<Case> cases = {
-        {"broken.cg", nullptr, CG_PROFILE_GLSLF, CG_COMPILER_ERROR, "broken.cg(3) : error: "},
-        {"broken.cg", "other", CG_PROFILE_GLSLF, CG_COMPILER_ERROR, "other"},
+        {broken.path().c_str(), nullptr, CG_PROFILE_GLSLF, CG_COMPILER_ERROR, place.c_str()},
+        {broken.path().c_str(), "other", CG_PROFILE_GLSLF, CG_COMPILER_ERROR, "other"},
         {"not/there.cg", "main", CG_PROFILE_GLSLF, CG_FILE_READ_ERROR, "not/there.cg"},
         {".", "main", CG_PROFILE_GLSLF, CG_FILE_READ_ERROR, "."},
     };
@@ -536,28 +521,28 @@ TEST_F(CgRuntime, ThePairsOfAProcessMayHaveAnyNumberOfVaryingNames) {
         for (const size_t count = 3 + random() % 5; names.size() < count;)
             names.insert(static_cast<unsigned>(random() % POOL));
         // Each stage has names that the other lacks; what both have comes through.
-        std::string outputs, writes, inputs, sum;
+        std::ostringstream outputs, writes, inputs, sum;
         Pixel expected{};
         for (const unsigned name : names) {
-            const std::string text = std::to_string(name);
-            const std::string parameter = "float4 v" + text + " : OWN_" + text + '_';
             const bool isRead = name == *names.begin() || random() % 4 != 0;
-            const float weight = static_cast<float>(1 + random() % 8);
-            outputs += ", out " + parameter;
-            writes += "    v" + text + " = float4(" + text + ", 1, 0, " + std::to_string(pair) + ");\n";
+            const auto weight = 1 + random() % 8;
+            outputs << ", out float4 v" << name << " : OWN_" << name << '_';
+            writes << "    v" << name << " = float4(" << name << ", 1, 0, " << pair << ");\n";
             if (!isRead)
                 continue;
-            inputs += parameter + ", ";
-            sum += " + " + std::to_string(weight) + " * v" + text;
+            inputs << "float4 v" << name << " : OWN_" << name << "_, ";
+            sum << " + " << weight << ".0 * v" << name;
             const Pixel written = {static_cast<float>(name), 1, 0, static_cast<float>(pair)};
             for (size_t i = 0; i < 4; ++i)
-                expected[i] += weight * written[i];
+                expected[i] += static_cast<float>(weight) * written[i];
         }
-        const std::string lacking = std::to_string(random() % POOL + POOL);
-        const std::string source = "void vertex(inout float4 position : POSITION" + outputs + ")\n{\n" +
-                                   writes + "}\nfloat4 fragment(" + inputs + "float4 lacking : OWN_" +
-                                   lacking + "_, uniform bool isShown = false) : COLOR\n{\n" +
-                                   "    return isShown ? lacking : float4(0)" + sum + ";\n}\n";
+        std::ostringstream text;
+        text << "void vertex(inout float4 position : POSITION" << outputs.str() << ")\n{\n"
+             << writes.str() << "}\n"
+             << "float4 fragment(" << inputs.str() << "float4 lacking : OWN_" << random() % POOL + POOL
+             << "_, uniform bool isShown = false) : COLOR\n{\n"
+             << "    return isShown ? lacking : float4(0)" << sum.str() << ";\n}\n";
+        const std::string source = text.str();
         const bool isFragmentFirst = random() % 2 != 0;
         for (const bool isFragment : {isFragmentFirst, !isFragmentFirst}) {
             const CGprofile profile = isFragment ? CG_PROFILE_GLSLF : CG_PROFILE_GLSLV;

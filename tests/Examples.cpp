@@ -1,49 +1,29 @@
+#include <fixture/FileText.h>
 #include <fixture/GlTest.h>
-#include <fixture/PictureFiles.h>
 #include <fixture/ReadPng.h>
+#include <fixture/ShellCommand.h>
+#include <fixture/TemporaryFile.h>
 
 #include <FwZel/VideoTestImage.h>
 
-#include <sys/wait.h>
-
-#include <array>
-#include <cstdio>
-#include <fstream>
-#include <iterator>
 #include <regex>
 #include <vector>
 
 namespace {
 
-std::string textOf(const std::string& path) {
-    std::ifstream file(path, std::ios::binary);
-    return {std::istreambuf_iterator<char>(file), std::istreambuf_iterator<char>()};
-}
-
-struct ExampleRun {
-    int exitCode;
-    std::string output; ///< standard output and standard error
-};
-
-/// Runs an example as it was built. The driver's own memory seems to leak when a program lets go of it.
-ExampleRun runExample(const std::string& exampleAndArguments, const std::string& environment = "") {
-    const std::string command = environment +
-                                " ASAN_OPTIONS=\"$ASAN_OPTIONS:detect_leaks=0\" '" FWZEL_EXAMPLES_BUILT "/'" +
-                                exampleAndArguments + " 2>&1";
-    std::FILE* const pipe = popen(command.c_str(), "r");
-    std::string output;
-    std::array<char, 4096> chunk = {};
-    while (const size_t size = std::fread(chunk.data(), 1, chunk.size(), pipe))
-        output.append(chunk.data(), size);
-    const int status = pclose(pipe);
-    return {WIFEXITED(status) ? WEXITSTATUS(status) : -1, output};
+/// Runs an example as it was built; standard error is part of the output. The driver's own memory seems to
+/// leak when a program lets go of it.
+ShellRun runExample(const std::string& exampleAndArguments, const std::string& environment = "") {
+    return runShell(environment +
+                    " ASAN_OPTIONS=\"$ASAN_OPTIONS:detect_leaks=0\" '" FWZEL_EXAMPLES_BUILT "/'" +
+                    exampleAndArguments + " 2>&1");
 }
 
 /// Skipped where there is no context, as the examples would fail.
 class Examples : public GlTest {};
 
 TEST_F(Examples, SmallestHostDrawsThreeFramesOfMagenta) {
-    const ExampleRun example = runExample("smallest_host");
+    const ShellRun example = runExample("smallest_host");
     EXPECT_EQ(example.exitCode, 0);
     EXPECT_EQ(example.output, "frame 0: 191 0 191 in the middle\n"
                               "frame 1: 191 0 191 in the middle\n"
@@ -54,7 +34,7 @@ TEST_F(Examples, ProducerThreadsFramesAreAllDrawnInOrder) {
     std::string expected;
     for (int frame = 0; frame < 20; ++frame)
         expected += "frame " + std::to_string(frame) + ": bar at " + std::to_string(32 * frame) + '\n';
-    const ExampleRun example = runExample("producer_thread");
+    const ShellRun example = runExample("producer_thread");
     EXPECT_EQ(example.exitCode, 0);
     EXPECT_EQ(example.output, expected);
 }
@@ -66,7 +46,7 @@ TEST_F(Examples, ReadbackFileShowsThePatternToTheByte) {
     VideoTestImage::fillTestPattern(pattern.data(), VideoTestImage::COL_RGBA, WIDTH, HEIGHT, WIDTH,
                                     VideoTestImage::COMBI, 2, 0, 0, WIDTH, HEIGHT, false);
     const TemporaryFile picture("combi.png");
-    const ExampleRun example = runExample("readback_to_file " + picture.path());
+    const ShellRun example = runExample("readback_to_file " + picture.path());
     EXPECT_EQ(example.exitCode, 0);
     EXPECT_EQ(example.output, "");
     const DecodedPng decoded = readPng(picture.path());
@@ -76,7 +56,7 @@ TEST_F(Examples, ReadbackFileShowsThePatternToTheByte) {
 }
 
 TEST_F(Examples, CgProgramsDrawWithTheirParameters) {
-    const ExampleRun example = runExample("cg_parameters '" FWZEL_EXAMPLES "/cg_parameters.cg'");
+    const ShellRun example = runExample("cg_parameters '" FWZEL_EXAMPLES "/cg_parameters.cg'");
     EXPECT_EQ(example.exitCode, 0);
     EXPECT_EQ(example.output, "plane: 217 82 115\nbox: 255 204 0\n");
 }
@@ -84,7 +64,7 @@ TEST_F(Examples, CgProgramsDrawWithTheirParameters) {
 TEST_F(Examples, WhatTheContextLacksIsNamed) {
     for (const char* const call : {"smallest_host", "producer_thread", "readback_to_file /dev/null",
                                    "cg_parameters '" FWZEL_EXAMPLES "/cg_parameters.cg'"}) {
-        const ExampleRun example = runExample(call, "MESA_EXTENSION_OVERRIDE=-GL_EXT_framebuffer_object");
+        const ShellRun example = runExample(call, "MESA_EXTENSION_OVERRIDE=-GL_EXT_framebuffer_object");
         EXPECT_EQ(example.exitCode, 1) << call;
         EXPECT_NE(example.output.find(" lacks framebuffers and mip maps ("), std::string::npos)
             << example.output;
@@ -102,7 +82,7 @@ TEST_F(Examples, WhatCannotBeDoneIsNamed) {
         {"cg_parameters", "usage: cg_parameters PROGRAM.cg"},
     };
     for (const auto& failure : failures) {
-        const ExampleRun example = runExample(failure.call);
+        const ShellRun example = runExample(failure.call);
         EXPECT_EQ(example.exitCode, 1) << failure.call;
         EXPECT_NE(example.output.find(failure.reason), std::string::npos) << example.output;
     }
@@ -112,7 +92,7 @@ TEST_F(Examples, WhatCannotBeDoneIsNamed) {
 std::vector<std::string> quotedCode() {
     const std::string begin = "```cpp\n";
     const std::string end = "```\n";
-    const std::string text = textOf(FWZEL_EXAMPLES "/../README.md");
+    const std::string text = fileText(FWZEL_EXAMPLES "/../README.md");
     std::vector<std::string> blocks;
     for (size_t at = text.find(begin); at != std::string::npos; at = text.find(begin, at)) {
         at += begin.size();
@@ -124,9 +104,9 @@ std::vector<std::string> quotedCode() {
 TEST(ExamplesInReadme, AreThoseThatAreBuilt) {
     const std::vector<std::string> quoted = quotedCode();
     ASSERT_EQ(quoted.size(), 2U);
-    EXPECT_EQ(quoted[0], textOf(FWZEL_EXAMPLES "/smallest_host.cpp"));
+    EXPECT_EQ(quoted[0], fileText(FWZEL_EXAMPLES "/smallest_host.cpp"));
     const std::string indented = std::regex_replace("\n" + quoted[1], std::regex("\n(?=.)"), "\n    ");
-    EXPECT_NE(textOf(FWZEL_EXAMPLES "/cg_parameters.cpp").find(indented), std::string::npos) << indented;
+    EXPECT_NE(fileText(FWZEL_EXAMPLES "/cg_parameters.cpp").find(indented), std::string::npos) << indented;
 }
 
 } // namespace

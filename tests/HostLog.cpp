@@ -1,4 +1,4 @@
-#include <fixture/PictureFiles.h>
+#include <fixture/TemporaryFile.h>
 
 #include <FwZel/kxsys_syslog.h>
 

@@ -1,5 +1,5 @@
 #include <fixture/CapturedLog.h>
-#include <fixture/PictureFiles.h>
+#include <fixture/TemporaryFile.h>
 
 #include <FrameLoop.h>
 #include <HeadlessSurface.h>

@@ -1,5 +1,5 @@
 #include <fixture/GlTest.h>
-#include <fixture/PictureFiles.h>
+#include <fixture/TemporaryFile.h>
 #include <fixture/TextureCalls.h>
 
 #include <FwZel/Texture.h>

@@ -5,7 +5,7 @@
 
 #include <fixture/GlTest.h>
 #include <fixture/GuardedTexture.h>
-#include <fixture/PictureFiles.h>
+#include <fixture/TemporaryFile.h>
 
 #include <cstring>
 

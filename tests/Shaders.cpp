@@ -4,13 +4,13 @@
 #include <fixture/CgCalls.h>
 #include <fixture/FloatCanvas.h>
 #include <fixture/GlTest.h>
+#include <fixture/TemporaryFile.h>
 
 #include <sys/wait.h>
 #include <unistd.h>
 
 #include <cstdio>
 #include <cstdlib>
-#include <fstream>
 #include <map>
 #include <memory>
 #include <sstream>
@@ -193,25 +193,8 @@ TEST_F(Shaders, WithoutAResourceTableResourceOperationsAreReported) {
     EXPECT_EQ(takeCgCalls(), Calls{});
 }
 
-/// A source file that is gone with the object.
-class SourceFile {
-public:
-    explicit SourceFile(const std::string& source)
-        : mPath(testing::TempDir() + "shaders-" + std::to_string(getpid()) + ".cg") {
-        std::ofstream(mPath) << source;
-    }
-    ~SourceFile() { std::remove(mPath.c_str()); }
-    SourceFile(const SourceFile&) = delete;
-    SourceFile& operator=(const SourceFile&) = delete;
-
-    const std::string& path() const { return mPath; }
-
-private:
-    std::string mPath;
-};
-
 TEST_F(Shaders, PlaneIsDrawnByBothProgramsWithTheirParameters) {
-    const SourceFile file(R"(
+    const TemporaryFile file("shaders.cg", bytesOf(R"(
         uniform float gain;
         void place(float4 position : POSITION, uniform float2 scale,
                    out float4 placed : POSITION, out float4 colour : COLOR) {
@@ -220,7 +203,7 @@ TEST_F(Shaders, PlaneIsDrawnByBothProgramsWithTheirParameters) {
         }
         float4 mixed(float4 colour : COLOR, uniform float4x4 mixing, uniform float3 lift) : COLOR {
             return gain * (mul(mixing, colour) + float4(lift, 0));
-        })");
+        })"));
     Shader vertex(Shader::TYPE_VERTEX, file.path(), "place");
     Shader fragment(Shader::TYPE_FRAGMENT, file.path(), "mixed");
     const float firstRowLast[] = {0, 0, 0, 1, 0, 1, 0, 0, 0, 0, 1, 0, 1, 0, 0, 0};

@@ -1,7 +1,8 @@
 #include "ToolRun.h"
 
-#include <fixture/PictureFiles.h>
+#include <fixture/FileText.h>
 #include <fixture/ReadPng.h>
+#include <fixture/TemporaryFile.h>
 
 #include <FwZel/TestPatternCatalogue.h>
 #include <FwZel/VideoTestImage.h>
@@ -9,17 +10,10 @@
 #include <gtest/gtest.h>
 
 #include <filesystem>
-#include <fstream>
 #include <functional>
-#include <iterator>
 #include <sstream>
 
 namespace {
-
-std::string fileText(const std::string& path) {
-    std::ifstream file(path, std::ios::binary);
-    return {std::istreambuf_iterator<char>(file), std::istreambuf_iterator<char>()};
-}
 
 /// So many bytes of zero, with what a filler writes into them.
 std::string filled(size_t numBytes, const std::function<void(unsigned char*)>& fill) {

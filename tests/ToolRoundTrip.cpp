@@ -2,17 +2,15 @@
 
 #include <RoundTrip.h>
 
+#include <fixture/FileText.h>
 #include <fixture/GlTest.h>
-#include <fixture/PictureFiles.h>
 #include <fixture/ReadPng.h>
+#include <fixture/TemporaryFile.h>
 
 #include <FwZel/TestPatternCatalogue.h>
 #include <FwZel/VideoTestImage.h>
 
 #include <filesystem>
-#include <fstream>
-#include <iterator>
-#include <sstream>
 
 namespace {
 
@@ -27,8 +25,7 @@ std::vector<uint16_t> pixelsOf(uint32_t pattern, uint32_t width, uint32_t height
 
 /// The pixels of a PPM file as a texture holds them, with an opaque alpha.
 std::vector<uint16_t> pixelsOfPpm(const std::string& path) {
-    std::ifstream file(path, std::ios::binary);
-    const std::string bytes(std::istreambuf_iterator<char>(file), {});
+    const std::string bytes = fileText(path);
     const std::string header = "P6\n160 90\n255\n";
     std::vector<uint16_t> pixels;
     for (size_t i = header.size(); i + 2 < bytes.size(); i += 3) {

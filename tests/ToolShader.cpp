@@ -1,6 +1,6 @@
 #include "ToolRun.h"
 
-#include <fixture/PictureFiles.h>
+#include <fixture/TemporaryFile.h>
 
 #include <gtest/gtest.h>
 
