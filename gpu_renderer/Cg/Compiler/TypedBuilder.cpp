@@ -343,34 +343,29 @@ TypedExpr* TypedBuilder::product(SourceLocation at, TypedExpr* left, TypedExpr* 
 /// At least one operand is a matrix. A vector on the left is a row, one on the right a column. The matrices
 /// here are GLSL's transposed ones, so the product is turned around.
 TypedExpr* TypedBuilder::matrixProduct(SourceLocation at, TypedExpr* left, TypedExpr* right) {
-    const int leftColumns = left->type->columns;
-    const int rightRows = right->type->isMatrix() ? right->type->rows : right->type->columns;
-    const int inner = std::min(leftColumns, rightRows);
-    if (leftColumns != rightRows)
-        mDiagnostics.warning(at, "mul cuts '" + nameOf(left->type) + "' and '" + nameOf(right->type) +
+    const Type* leftType = left->type;
+    const Type* rightType = right->type;
+    const int rows = leftType->isMatrix() ? leftType->rows : 1;
+    const int columns = rightType->isMatrix() ? rightType->columns : 1;
+    const int rightRows = rightType->isMatrix() ? rightType->rows : rightType->columns;
+    const int inner = std::min(leftType->columns, rightRows);
+    if (leftType->columns != rightRows)
+        mDiagnostics.warning(at, "mul cuts '" + nameOf(leftType) + "' and '" + nameOf(rightType) +
                                      "' to sizes that fit");
-    const Scalar scalar = left->type->scalar;
-    const Type* leftType = left->type->isMatrix() ? mTypes.matrix(scalar, left->type->rows, inner)
-                                                  : mTypes.vector(scalar, inner);
-    const Type* rightType = right->type->isMatrix() ? mTypes.matrix(scalar, inner, right->type->columns)
-                                                    : mTypes.vector(scalar, inner);
-    left = reshape(left, leftType);
-    right = reshape(right, rightType);
-    const int rows = left->type->isMatrix() ? left->type->rows : 1;
-    const int columns = right->type->isMatrix() ? right->type->columns : 1;
-    const Type* result = left->type->isMatrix() && right->type->isMatrix()
+    const Scalar scalar = leftType->scalar;
+    const Type* result = leftType->isMatrix() && rightType->isMatrix()
                              ? mTypes.matrix(scalar, rows, columns)
                              : mTypes.vector(scalar, rows * columns);
-    const auto isPlain = [](const Type* type) { return type->isVector() || type->isFullMatrix(); };
-    const bool isProduct = isPlain(left->type) || isPlain(right->type);
-    // GLSL has no matrices of one row or column.
-    left = vectorOf(left);
-    right = vectorOf(right);
-    if (isProduct)
-        return infix(at, BinaryOp::MULTIPLY, result, right, left);
+    // Matrices of one row or column, which GLSL has not, are vectors from here on.
+    left = vectorOf(reshape(left, leftType->isMatrix() ? mTypes.matrix(scalar, rows, inner)
+                                                       : mTypes.vector(scalar, inner)));
+    right = vectorOf(reshape(right, rightType->isMatrix() ? mTypes.matrix(scalar, inner, columns)
+                                                          : mTypes.vector(scalar, inner)));
     if (rows == 1 && columns == 1)
         return builtin(at, result, "dot($0, $1)", {left, right});
-    return builtin(at, result, "outerProduct($1, $0)", {left, right});
+    if (left->type->isVector() && right->type->isVector())
+        return builtin(at, result, "outerProduct($1, $0)", {left, right});
+    return infix(at, BinaryOp::MULTIPLY, result, right, left);
 }
 
 } // namespace cg
