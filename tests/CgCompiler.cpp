@@ -2,6 +2,7 @@
 #include <fixture/GlslJudge.h>
 
 #include <Cg/Compiler/Compiler.h>
+#include <Cg/Compiler/ConversionCost.h>
 
 #include <gtest/gtest.h>
 
@@ -119,6 +120,52 @@ void describe(const cg::Parameter& parameter, std::vector<std::string>& out) {
         describe(child, out);
 }
 
+/// What the compiler knows of a constant's value: a global whose initial value it does not know is no
+/// uniform.
+struct Constant {
+    const char* type;
+    const char* expression;
+    const char* values; ///< null where it is left to the program
+};
+
+constexpr Constant CONSTANTS[] = {
+    {"int", "7 / 1", "7"},
+    {"int", "7 / 0", nullptr},
+    {"int", "7 % 1", "0"},
+    {"int", "7 % 0", nullptr},
+    {"int4", "int4(6, 6, 6, 6) | int4(0, 1, 2, 8)", "6 7 6 14"},
+    {"int", "5 & 0", "0"},
+    {"int3", "int3(1 << 33, -8 >> 33, 5 ^ 0)", "2 -4 5"},
+    {"int3", "int3(-2147483648.0, -2147483649.0, 4294967295.0)", "-2.14748e+09 0 -1"},
+    {"float", "float((uint)4294967295.0)", "4.29497e+09"},
+    {"float2", "float2((uint)-1, (uint)4294967295.5)", "4.29497e+09 0"},
+    {"int2", "int2((int)4294967295.5, (int)(bool)0.5)", "0 1"},
+    {"float4", "float4(2 > 1 && 0, 2 > 1 && 3, 0 || 0, 0 || 2)", "0 1 0 1"},
+    {"float4", "float4(!2, !1, !0.0, +true)", "0 0 1 1"},
+    {"float4", "true ? float4(1, 2, 3, 4) - 1 : 0", "0 1 2 3"},
+    {"float3", "2 > 3 ? float3(1, 1, 1) : 2 * float3(1, 2, 3).zxy", "6 2 4"},
+    {"float", "float3(1, 2, 3)[1]", "2"},
+    {"float", "TABLE[1][2]", "6"},
+    {"float3", "TABLE[1]", "4 5 6"},
+    {"float", "TABLE[LAST].x", "4"},
+    {"float2x2", "float3x3(1, 2, 3, 4, 5, 6, 7, 8, 9)", "1 2 4 5"},
+    {"float2", "(float2)float2x2(1, 2, 3, 4)", "1 2"},
+    {"float2x2", "SCALED * 2", "2 4 6 8"},
+    {"float2", "mul(SCALED, float2(1, 2))", nullptr},
+    {"float2x2", "mul(SCALED, SCALED)", nullptr},
+    {"float2x2", "SCALED * SCALED", nullptr},
+    {"Nest", "(Nest)0", "0 0 0 0"},
+    {"float4", "float4(sign(-0.5), sign(0), sign(0.5), abs(-2.5))", "-1 0 1 2.5"},
+    {"float4", "float4(step(1, 1), step(1, 0.5), saturate(-1), saturate(0.25))", "1 0 0 0.25"},
+    {"float4", "float4(min(3, 2), round(2.5), rcp(4.0), exp(0))", "2 2 0.25 1"},
+    {"float2", "lerp(float2(0, 2), float2(1, 4), 0.5)", "0.5 3"},
+    {"float", "dot(float3(1, 2, 3), float3(4, 5, 6))", "32"},
+    {"float", "length(float3(2, 3, 6))", "7"},
+    {"float3", "normalize(float3(0, 0, 2))", "0 0 1"},
+    {"float", "sqrt(ddx(2.0))", nullptr},
+    {"float", "1e-50", "0"},
+};
+
 std::vector<std::string> parametersOf(const std::string& source) {
     const cg::CompileResult result = compileFragment(source);
     EXPECT_TRUE(result.ok) << result.listing;
@@ -174,6 +221,89 @@ TEST(CgParameters, HaveTheirDefaultValuesRowByRow) {
                                    "P p = { 2, float2(4) }; bool on = true; const float two = sqrt(4);\n"
                                    "uniform float gamma = pow(two, -2);\n"
                                    "float4 main() : COLOR { return 1; }\n"));
+}
+
+TEST(CgParameters, AreTheGlobalsWhoseInitialValuesAreKnown) {
+    std::string program = "struct Nest { float2x2 m; };\n"
+                          "static const float3 TABLE[2] = { { 1, 2, 3 }, { 4, 5, 6 } };\n"
+                          "static const int LAST = 1; static const float2x2 SCALED = { 1, 2, 3, 4 };\n";
+    std::vector<std::string> wanted = {"return ->  : COLOR"};
+    for (const Constant& constant : CONSTANTS) {
+        const bool isStruct = std::string_view(constant.type) == "Nest";
+        program += std::string(constant.type) + " c" + std::to_string(&constant - CONSTANTS) + " = " +
+                   constant.expression + ";\n";
+        if (constant.values)
+            wanted.push_back("c" + std::to_string(&constant - CONSTANTS) + (isStruct ? ".m" : "") +
+                             " ->  unused " + constant.values);
+    }
+    EXPECT_EQ(wanted, parametersOf(program + "float4 main() : COLOR { return 1; }\n"));
+}
+
+/// Each constant is made of the one before.
+TEST(CgParameters, EndWithChainsOfTooManyConstants) {
+    const auto chain = [](int length) {
+        std::string program = "static const float a0 = 3;\n";
+        for (int i = 1; i < length; ++i)
+            program += "static const float a" + std::to_string(i) + " = a" + std::to_string(i - 1) + ";\n";
+        program += "float end = a" + std::to_string(length - 1) + ";\n";
+        return parametersOf(program + "float4 main() : COLOR { return 1; }\n").size();
+    };
+    EXPECT_EQ(2U, chain(65));
+    EXPECT_EQ(1U, chain(66));
+}
+
+/// What it costs to pass a type on as others: which overload a call takes hangs on the sums. `untyped` is a
+/// number without a suffix, `-` stands where there is no silent conversion.
+struct Costs {
+    const char* from;
+    const char* to;
+};
+
+constexpr Costs COSTS[] = {
+    {"bool", "bool 0 int 5 uint 5 fixed 9 half 8 float 7 bool4 20 float4 27"},
+    {"int", "bool 12 int 0 uint 2 fixed 5 half 4 float 3"},
+    {"uint", "bool 12 int 2 uint 0 fixed 5 half 4 float 3"},
+    {"fixed", "bool 12 int 9 uint 10 fixed 0 half 1 float 2"},
+    {"half", "bool 12 int 9 uint 10 fixed 6 half 0 float 1"},
+    {"float", "bool 12 int 9 uint 10 fixed 7 half 6 float 0 float2 20 float1x2 50 float2x2 50 sampler2D -"},
+    {"untyped", "fixed 2 half 1 float 0"},
+    {"float4", "float 45 float2 42 float3 41 half3 47 float4 0 float4x1 30 float1x3 71 float2x2 -"},
+    {"float3", "float4 - float4x1 -"},
+    {"float1x3", "float 45 float2 71 float3 30 float1x2 40 float2x1 - half1x3 6"},
+    {"float2x3", "float - float3 - float2x2 40 float1x3 40 float2x3 0 float3x3 - float2x4 - half2x3 6"},
+    {"sampler", "sampler2D 1 samplerCUBE 1"},
+    {"sampler2D", "sampler 1 sampler2DShadow 1 sampler1D - float -"},
+    {"float4[2]",
+     "float4[2] 0 float4[] 0 float4[3] - half4[2] 6 int4[2] - float3[2] - float1x4[2] 30 float4 -"},
+    {"sampler2D[2]", "sampler[2] 1 sampler3D[2] -"},
+    {"float[2][3]", "float[2][3] 0 half[2][3] 6 float[2][4] -"},
+};
+
+/// The type of a name with dimensions behind it.
+const cg::Type* typeNamed(cg::TypeTable& types, const std::string& name) {
+    const size_t bracket = name.rfind('[');
+    if (bracket == std::string::npos)
+        return types.find(name);
+    const std::string length = name.substr(bracket + 1, name.size() - bracket - 2);
+    return types.array(typeNamed(types, name.substr(0, bracket)),
+                       length.empty() ? cg::Type::UNSIZED : std::stoi(length));
+}
+
+TEST(CgConversions, CostWhatChoosesAmongOverloads) {
+    cg::Arena arena;
+    cg::TypeTable types(arena);
+    for (const Costs& costs : COSTS) {
+        const bool isUntyped = std::string_view(costs.from) == "untyped";
+        cg::TypedExpr from(cg::TypedExpr::Kind::LITERAL, {},
+                           typeNamed(types, isUntyped ? "float" : costs.from));
+        from.isUntyped = isUntyped;
+        std::istringstream wanted(costs.to);
+        for (std::string to, cost; wanted >> to >> cost;) {
+            const int found = cg::conversionCost(&from, typeNamed(types, to));
+            EXPECT_EQ(cost, found == cg::IMPOSSIBLE_CONVERSION ? "-" : std::to_string(found))
+                << costs.from << " to " << to;
+        }
+    }
 }
 
 } // namespace

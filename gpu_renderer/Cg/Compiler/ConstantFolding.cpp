@@ -3,6 +3,7 @@
 #include <algorithm>
 #include <cmath>
 #include <cstdint>
+#include <limits>
 
 namespace cg {
 
@@ -12,21 +13,20 @@ using Kind = TypedExpr::Kind;
 using Values = std::vector<double>;
 using MaybeValues = std::optional<Values>;
 
-/// Far more than a constant table holds.
-constexpr std::size_t MAX_VALUES = 1 << 20;
-
-/// Two's complement arithmetic, without overflow being undefined.
-double integerOperation(BinaryOp op, double left, double right, bool& isValid) {
+/// Two's complement arithmetic, without overflow being undefined. Nothing where a divisor is 0.
+std::optional<double> integerOperation(BinaryOp op, double left, double right) {
     const auto a = static_cast<std::int64_t>(left);
     const auto b = static_cast<std::int64_t>(right);
     const auto bits = static_cast<unsigned>(b & 31);
     switch (op) {
     case BinaryOp::DIVIDE:
-        isValid = b != 0;
-        return isValid ? std::trunc(left / right) : 0;
+        if (b == 0)
+            return std::nullopt;
+        return std::trunc(left / right);
     case BinaryOp::MODULO:
-        isValid = b != 0;
-        return isValid ? static_cast<double>(a % b) : 0;
+        if (b == 0)
+            return std::nullopt;
+        return static_cast<double>(a % b);
     case BinaryOp::SHIFT_LEFT:
         return static_cast<double>(static_cast<std::int32_t>(static_cast<std::uint32_t>(a) << bits));
     case BinaryOp::SHIFT_RIGHT:
@@ -38,12 +38,11 @@ double integerOperation(BinaryOp op, double left, double right, bool& isValid) {
     case BinaryOp::BIT_XOR:
         return static_cast<double>(a ^ b);
     default:
-        isValid = false;
-        return 0;
+        return std::nullopt;
     }
 }
 
-double operation(BinaryOp op, double left, double right, Scalar scalar, bool& isValid) {
+std::optional<double> operation(BinaryOp op, double left, double right, Scalar scalar) {
     switch (op) {
     case BinaryOp::MULTIPLY:
         return left * right;
@@ -52,27 +51,26 @@ double operation(BinaryOp op, double left, double right, Scalar scalar, bool& is
     case BinaryOp::SUBTRACT:
         return left - right;
     case BinaryOp::LESS:
-        return left < right ? 1 : 0;
+        return left < right;
     case BinaryOp::GREATER:
-        return left > right ? 1 : 0;
+        return left > right;
     case BinaryOp::LESS_EQUAL:
-        return left <= right ? 1 : 0;
+        return left <= right;
     case BinaryOp::GREATER_EQUAL:
-        return left >= right ? 1 : 0;
+        return left >= right;
     case BinaryOp::EQUAL:
-        return left == right ? 1 : 0;
+        return left == right;
     case BinaryOp::NOT_EQUAL:
-        return left != right ? 1 : 0;
+        return left != right;
     case BinaryOp::AND:
-        return left != 0 && right != 0 ? 1 : 0;
+        return left != 0 && right != 0;
     case BinaryOp::OR:
-        return left != 0 || right != 0 ? 1 : 0;
+        return left != 0 || right != 0;
+    case BinaryOp::DIVIDE:
+        return isFloating(scalar) ? left / right : integerOperation(op, left, right);
     default:
-        break;
+        return integerOperation(op, left, right);
     }
-    if (op == BinaryOp::DIVIDE && isFloating(scalar))
-        return left / right;
-    return integerOperation(op, left, right, isValid);
 }
 
 struct ComponentFunction {
@@ -160,8 +158,6 @@ private:
         return values;
     }
 
-    static int componentsOf(const Type* type) { return type->isNumeric() ? type->components() : 0; }
-
     MaybeValues swizzle(const TypedExpr* expression) {
         const MaybeValues object = evaluate(expression->operands[0]);
         if (!object)
@@ -179,9 +175,10 @@ private:
     MaybeValues element(const TypedExpr* expression) {
         const MaybeValues object = evaluate(expression->operands[0]);
         const MaybeValues index = evaluate(expression->operands[1]);
-        if (!object || !index || index->empty() || (*index)[0] < 0)
+        if (!object || !index || (*index)[0] < 0)
             return std::nullopt;
-        const auto size = static_cast<std::size_t>(countLeaves(expression->type, MAX_VALUES));
+        const auto size =
+            static_cast<std::size_t>(countLeaves(expression->type, std::numeric_limits<int>::max()));
         const auto first = static_cast<std::size_t>((*index)[0]) * size;
         if (first + size > object->size())
             return std::nullopt;
@@ -220,7 +217,7 @@ private:
         const bool isMatrixProduct = expression->binary == BinaryOp::MULTIPLY &&
                                      (left->type->isMatrix() || right->type->isMatrix()) &&
                                      !left->type->isScalar() && !right->type->isScalar();
-        if (isMatrixProduct || expression->binary == BinaryOp::COMMA)
+        if (isMatrixProduct)
             return std::nullopt;
         const MaybeValues a = evaluate(left);
         const MaybeValues b = evaluate(right);
@@ -228,20 +225,19 @@ private:
             return std::nullopt;
         const std::size_t count = std::max(a->size(), b->size());
         Values values;
-        bool isValid = true;
-        for (std::size_t i = 0; i < count; ++i)
-            values.push_back(operation(expression->binary, a->size() == 1 ? (*a)[0] : (*a)[i],
-                                       b->size() == 1 ? (*b)[0] : (*b)[i], left->type->scalar, isValid));
-        if (!isValid)
-            return std::nullopt;
-        if (expression->type->isScalar() && values.size() > 1)
-            return std::nullopt; // a comparison of whole objects
+        for (std::size_t i = 0; i < count; ++i) {
+            const auto value = operation(expression->binary, a->size() == 1 ? (*a)[0] : (*a)[i],
+                                         b->size() == 1 ? (*b)[0] : (*b)[i], left->type->scalar);
+            if (!value)
+                return std::nullopt;
+            values.push_back(*value);
+        }
         return rounded(values, expression->type);
     }
 
     MaybeValues conditional(const TypedExpr* expression) {
         const MaybeValues condition = evaluate(expression->operands[0]);
-        if (!condition || condition->size() != 1)
+        if (!condition)
             return std::nullopt;
         return evaluate(expression->operands[(*condition)[0] != 0 ? 1 : 2]);
     }
@@ -250,19 +246,15 @@ private:
         Values values;
         for (const TypedExpr* operand : expression->operands) {
             const MaybeValues part = evaluate(operand);
-            if (!part || values.size() + part->size() > MAX_VALUES)
+            if (!part)
                 return std::nullopt;
             values.insert(values.end(), part->begin(), part->end());
         }
         const Type* type = expression->type;
         if (!type->isNumeric())
             return values;
-        const auto wanted = static_cast<std::size_t>(type->components());
-        if (values.size() == 1)
-            values.resize(wanted, values[0]);
-        if (values.size() < wanted)
-            return std::nullopt;
-        values.resize(wanted);
+        // One value is the zero of a whole matrix; values too many are dropped.
+        values.resize(static_cast<std::size_t>(type->components()), values[0]);
         return rounded(values, type);
     }
 
@@ -273,7 +265,7 @@ private:
         if (!values || !to->isNumeric())
             return values;
         if (from->isScalar())
-            values->resize(static_cast<std::size_t>(componentsOf(to)), (*values)[0]);
+            values->resize(static_cast<std::size_t>(to->components()), (*values)[0]);
         if (from->isFullMatrix() && to->isFullMatrix()) {
             Values cut;
             for (int row = 0; row < to->rows; ++row)
@@ -291,13 +283,11 @@ private:
         std::size_t count = 0;
         for (const TypedExpr* operand : expression->operands) {
             MaybeValues values = evaluate(operand);
-            if (!values || values->empty())
+            if (!values)
                 return std::nullopt;
             count = std::max(count, values->size());
             operands.push_back(std::move(*values));
         }
-        if (operands.empty())
-            return std::nullopt;
         if (expression->form == "dot($0, $1)" || expression->form == "length($0)" ||
             expression->form == "normalize($0)")
             return geometric(expression, operands);
@@ -321,7 +311,7 @@ private:
         const Values& a = operands[0];
         const Values& b = operands.back();
         double sum = 0;
-        for (std::size_t i = 0; i < a.size() && i < b.size(); ++i)
+        for (std::size_t i = 0; i < a.size(); ++i)
             sum += a[i] * b[i];
         if (expression->form == "dot($0, $1)")
             return rounded({sum}, expression->type);
@@ -349,23 +339,14 @@ private:
 } // namespace
 
 double valueAs(double value, Scalar scalar) {
-    switch (scalar) {
-    case Scalar::BOOL:
-        return value != 0 ? 1 : 0;
-    case Scalar::INT:
-        return value >= -2147483648.0 && value <= 2147483647.0
-                   ? static_cast<double>(static_cast<std::int32_t>(value))
-               : value > 0 && value <= 4294967295.0
-                   ? static_cast<double>(static_cast<std::int32_t>(static_cast<std::uint32_t>(value)))
-                   : 0;
-    case Scalar::UINT:
-        return value >= 0 && value <= 4294967295.0 ? static_cast<double>(static_cast<std::uint32_t>(value))
-               : value < 0 && value >= -2147483648.0
-                   ? static_cast<double>(static_cast<std::uint32_t>(static_cast<std::int32_t>(value)))
-                   : 0;
-    default:
+    if (isFloating(scalar))
         return static_cast<double>(static_cast<float>(value));
-    }
+    if (scalar == Scalar::BOOL)
+        return value != 0;
+    const bool fits = value >= -2147483648.0 && value <= 4294967295.0; // an int or a uint, and is a number
+    const auto bits = fits ? static_cast<std::uint32_t>(static_cast<std::int64_t>(value)) : 0U;
+    return scalar == Scalar::INT ? static_cast<double>(static_cast<std::int32_t>(bits))
+                                 : static_cast<double>(bits);
 }
 
 std::optional<std::vector<double>> constantValue(const TypedExpr* expression) {

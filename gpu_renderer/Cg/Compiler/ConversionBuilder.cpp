@@ -4,6 +4,7 @@
 #include <Cg/Compiler/ConversionCost.h>
 #include <Cg/Compiler/Diagnostics.h>
 
+#include <algorithm>
 #include <string>
 #include <utility>
 
@@ -76,13 +77,14 @@ TypedExpr* ConversionBuilder::smear(TypedExpr* scalar, const Type* to) {
                 std::vector<TypedExpr*>(static_cast<std::size_t>(to->rows), row));
 }
 
-/// To something with the components of a vector: row by row, as many as are wanted.
+/// To something with the components of a vector, no more than the matrix has: row by row, as many as are
+/// wanted.
 TypedExpr* ConversionBuilder::reshapeRows(TypedExpr* matrix, const Type* to) {
     const SourceLocation at = matrix->location;
     const Type* type = matrix->type;
     const int columns = to->isMatrix() ? to->columns : type->columns;
     std::vector<TypedExpr*> rows;
-    for (int row = 0; row < type->rows && row * columns < to->components(); ++row)
+    for (int row = 0; row * columns < to->components(); ++row)
         rows.push_back(firstOf(at, element(at, matrix, row), columns));
     if (to->isScalar())
         return firstOf(at, rows[0], 1);
@@ -179,10 +181,8 @@ TypedExpr* ConversionBuilder::construct(SourceLocation at, const Type* type,
             for (int row = 0; row < argument->type->rows; ++row)
                 operands.push_back(withScalar(element(at, argument, row), type->scalar));
         } else {
-            TypedExpr* vector = vectorOf(argument);
-            if (vector->type->components() > wanted)
-                vector = firstOf(at, vector, wanted);
-            operands.push_back(withScalar(vector, type->scalar));
+            const int taken = std::min(wanted, argument->type->components());
+            operands.push_back(withScalar(firstOf(at, vectorOf(argument), taken), type->scalar));
         }
         components += argument->type->components();
     }

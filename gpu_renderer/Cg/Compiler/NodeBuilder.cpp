@@ -125,8 +125,8 @@ TypedExpr* NodeBuilder::swizzle(SourceLocation at, TypedExpr* object, const std:
         return swizzle(at, object->operands[0], inner);
     }
     TypedExpr* expression = make(Kind::SWIZZLE, at, type, {object});
-    for (std::size_t i = 0; i < components.size(); ++i)
-        expression->components[i] = static_cast<std::uint8_t>(components[i]);
+    std::transform(components.begin(), components.end(), expression->components.begin(),
+                   [](int component) { return static_cast<std::uint8_t>(component); });
     return expression;
 }
 

@@ -83,10 +83,9 @@ Sampler withoutDepth(Sampler sampler) {
 } // namespace
 
 int StructType::find(Name field) const {
-    for (std::size_t i = 0; i < fields.size(); ++i)
-        if (fields[i].name == field)
-            return static_cast<int>(i);
-    return -1;
+    const auto found =
+        std::find_if(fields.begin(), fields.end(), [field](const Field& one) { return one.name == field; });
+    return found == fields.end() ? -1 : static_cast<int>(found - fields.begin());
 }
 
 TypeTable::TypeTable(Arena& arena) : mArena(arena) {
