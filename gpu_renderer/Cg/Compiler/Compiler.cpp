@@ -9,13 +9,13 @@
 #include <Cg/Compiler/Parser.h>
 #include <Cg/Compiler/Preprocessor.h>
 #include <Cg/Compiler/References.h>
-#include <Cg/Compiler/Resolver.h>
+#include <Cg/Compiler/Resolver/Resolver.h>
+#include <Cg/Compiler/Resolver/SamplerKinds.h>
 #include <Cg/Compiler/SourceFiles.h>
 #include <Cg/Compiler/StageInterface.h>
 #include <Cg/Compiler/VaryingPlaces.h>
 
 #include <cstddef>
-#include <set>
 
 namespace cg {
 
@@ -57,14 +57,14 @@ void translate(const CompileRequest& request, SourceFiles& files, Diagnostics& d
     if (diagnostics.hasErrors())
         return;
     TypeTable types(arena);
-    std::set<Name> plainSamplers;
+    SamplerKinds samplerKinds;
     std::size_t known = 0;
     TypedProgram* program = nullptr;
     do {
-        known = plainSamplers.size();
+        known = samplerKinds.plainCount();
         program =
-            Resolver(*unit, request.stage, arena, types, diagnostics, plainSamplers).resolve(request.entry);
-    } while (!diagnostics.hasErrors() && plainSamplers.size() > known);
+            Resolver(*unit, request.stage, arena, types, diagnostics, samplerKinds).resolve(request.entry);
+    } while (!diagnostics.hasErrors() && samplerKinds.plainCount() > known);
     if (diagnostics.hasErrors())
         return;
     VaryingPlaces ownPlaces;

@@ -1,5 +1,6 @@
 #include <Cg/Compiler/StateBindings.h>
 
+#include <algorithm>
 #include <cctype>
 #include <vector>
 
@@ -173,6 +174,16 @@ StateBinding findState(const std::string& path, const TypeTable& types) {
         return binding;
     }
     return {};
+}
+
+std::optional<std::string> stateSemantic(Name semantic) {
+    const std::size_t point = semantic.find('.');
+    std::string root(semantic.substr(0, point));
+    std::transform(root.begin(), root.end(), root.begin(),
+                   [](unsigned char c) { return static_cast<char>(std::toupper(c)); });
+    if (point == Name::npos || (root != "STATE" && root != "GLSTATE"))
+        return std::nullopt;
+    return std::string(semantic.substr(point + 1));
 }
 
 } // namespace cg

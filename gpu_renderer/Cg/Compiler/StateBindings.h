@@ -3,6 +3,7 @@
 
 #include <Cg/Compiler/Types.h>
 
+#include <optional>
 #include <string>
 
 namespace cg {
@@ -16,6 +17,11 @@ struct StateBinding {
 /// @param path  what is written after `glstate.` or `state.`: "matrix.mvp", "light[0].position",
 ///              "matrix.transpose.modelview[0]", "matrix.mvp.row[2]"
 StateBinding findState(const std::string& path, const TypeTable& types);
+
+/// @return the path in a semantic that names a piece of state, `STATE.MATRIX.MVP` or `glstate.fog.color`, in
+/// any
+///         case of letters; nothing for other semantics
+std::optional<std::string> stateSemantic(Name semantic);
 
 } // namespace cg
 

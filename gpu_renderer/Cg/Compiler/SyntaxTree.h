@@ -92,6 +92,12 @@ struct VariableDecl : Decl {
     Expr* initializer = nullptr; ///< also a parameter's default argument and an InitListExpr
 };
 
+/// @return how a parameter's argument travels; never NONE
+inline Direction directionOf(const VariableDecl* parameter) {
+    const Direction written = parameter->qualifiers.direction;
+    return written == Direction::NONE ? Direction::IN : written;
+}
+
 /// A function or its prototype (no body); also a method, in its struct or outside as `Light::shade`.
 struct FunctionDecl : Decl {
     explicit FunctionDecl(SourceLocation at) : Decl(Kind::FUNCTION, at) {}

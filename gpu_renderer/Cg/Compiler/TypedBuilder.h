@@ -2,7 +2,6 @@
 #define CG_COMPILER_TYPED_BUILDER_H
 
 #include <Cg/Compiler/ConversionBuilder.h>
-#include <Cg/Compiler/ConversionCost.h>
 
 namespace cg {
 
@@ -14,9 +13,6 @@ class TypedBuilder : public ConversionBuilder {
 public:
     TypedBuilder(Arena& arena, TypeTable& types, Diagnostics& diagnostics)
         : ConversionBuilder(arena, types, diagnostics) {}
-
-    static constexpr int IMPOSSIBLE = IMPOSSIBLE_CONVERSION;
-    static int cost(const TypedExpr* from, const Type* to) { return conversionCost(from, to); }
 
     /// All operators but those that change their operand.
     TypedExpr* unary(SourceLocation at, UnaryOp op, TypedExpr* operand);

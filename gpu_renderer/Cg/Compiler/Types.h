@@ -63,6 +63,7 @@ struct Type {
     bool isSampler() const { return kind == Kind::SAMPLER; }
     bool isStruct() const { return kind == Kind::STRUCT; }
     bool isArray() const { return kind == Kind::ARRAY; }
+    bool isUnsizedArray() const { return isArray() && length == UNSIZED; }
     int components() const { return rows * columns; }
 
     /// A matrix with one row or one column is a vector in GLSL, which has no such matrices.

@@ -1,0 +1,62 @@
+#ifndef CG_COMPILER_RESOLVER_FUNCTION_CONTEXT_H
+#define CG_COMPILER_RESOLVER_FUNCTION_CONTEXT_H
+
+#include <Cg/Compiler/TypedTree.h>
+
+#include <cstddef>
+#include <vector>
+
+namespace cg {
+
+/// What belongs to the function that is being resolved.
+struct FunctionContext {
+    struct ScopeEntry {
+        Name name;
+        Variable* variable; ///< null for a type
+        const Type* type;   ///< null for a variable
+    };
+
+    /// A variable of a `for` after its loop.
+    struct LoopVariable {
+        Variable* variable;
+        TypedStmt* loop;
+    };
+
+    /// @return the innermost one of that name, or null
+    Variable* findVariable(Name name) const;
+    const Type* findType(Name name) const;
+
+    bool isInScope(const Variable* variable) const;
+
+    void declare(Name name, Variable* variable) { scope.push_back({name, variable, nullptr}); }
+    void declare(Name name, const Type* type) { scope.push_back({name, nullptr, type}); }
+
+    Function* function = nullptr;
+    std::vector<ScopeEntry> scope;
+    std::vector<LoopVariable> pastLoops;           ///< of the blocks around
+    std::vector<TypedStmt*>* statements = nullptr; ///< of the innermost block
+    Variable* self = nullptr;                      ///< a method's object
+    Variable* declared = nullptr;                  ///< the one whose initial value is being resolved
+    bool isDeclaredUsed = false;                   ///< that value names its own variable
+    std::size_t ordinal = 0;                       ///< of the function's declaration
+    int loops = 0;                                 ///< around the statement
+    int switches = 0;
+    bool hasReturn = false;
+};
+
+/// Puts another context in place of the current one for as long as it lives.
+class ContextChange {
+public:
+    ContextChange(FunctionContext& current, FunctionContext inner);
+    ~ContextChange();
+    ContextChange(const ContextChange&) = delete;
+    ContextChange& operator=(const ContextChange&) = delete;
+
+private:
+    FunctionContext& mCurrent;
+    FunctionContext mOuter;
+};
+
+} // namespace cg
+
+#endif

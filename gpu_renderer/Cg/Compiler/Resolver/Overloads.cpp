@@ -1,0 +1,185 @@
+#include <Cg/Compiler/Resolver/Overloads.h>
+
+#include <Cg/Compiler/ConversionCost.h>
+#include <Cg/Compiler/Diagnostics.h>
+#include <Cg/Compiler/Resolver/Declarations.h>
+#include <Cg/Compiler/Resolver/Refusals.h>
+#include <Cg/Compiler/Resolver/Resolution.h>
+#include <Cg/Compiler/Resolver/TypeResolver.h>
+
+#include <algorithm>
+
+namespace cg {
+
+namespace {
+
+using Kind = TypedExpr::Kind;
+
+/// A function could write to it.
+bool isPlace(const TypedExpr* argument) {
+    return rootVariable(argument) || argument->kind == Kind::CONSTRUCT;
+}
+
+} // namespace
+
+const Signature& Overloads::signatureOf(const FunctionDecl* declaration) {
+    const auto [slot, isNew] = mSignatures.emplace(declaration, Signature());
+    if (!isNew)
+        return slot->second;
+    const ContextChange outside(mResolution.context, {}); // its types mean the same for all callers
+    Signature signature;
+    signature.result = mTypes.typeOf(declaration->returnType);
+    for (const VariableDecl* parameter : declaration->parameters) {
+        const Type* type = mTypes.typeOf(parameter->type, parameter->dimensions);
+        if (!type)
+            signature.result = nullptr;
+        signature.parameters.push_back(type);
+    }
+    return mSignatures[declaration] = signature;
+}
+
+Overloads::Functions Overloads::candidates(Name name) {
+    const Functions& all = mDeclarations.functions(name);
+    const std::size_t ordinal = mResolution.context.ordinal;
+    Functions visible;
+    for (const FunctionDecl* function : all)
+        if (ordinal == 0 || mDeclarations.ordinal(function) <= ordinal)
+            visible.push_back(function);
+    Functions distinct;
+    for (const FunctionDecl* function : visible.empty() ? all : visible) {
+        const Signature& signature = signatureOf(function);
+        const bool isKnown = std::any_of(distinct.begin(), distinct.end(), [&](const FunctionDecl* other) {
+            return signatureOf(other).parameters == signature.parameters;
+        });
+        if (signature.result && !isKnown)
+            distinct.push_back(function);
+    }
+    return distinct;
+}
+
+Overloads::Functions Overloads::methods(const Type* type, Name name) const {
+    Functions methods;
+    if (!type->isStruct())
+        return methods;
+    const StructDecl* declaration = type->structure->declaration;
+    for (const FunctionDecl* method : declaration->methods)
+        if (method->name == name)
+            methods.push_back(method);
+    for (const FunctionDecl* method : mDeclarations.outsideMethods(declaration->name))
+        if (method->name == name)
+            methods.push_back(method);
+    return methods;
+}
+
+const FunctionDecl* Overloads::definitionOf(const FunctionDecl* declaration) {
+    if (declaration->body)
+        return declaration;
+    const Functions& all = declaration->ownerName.empty()
+                               ? mDeclarations.functions(declaration->name)
+                               : mDeclarations.outsideMethods(declaration->ownerName);
+    const std::vector<const Type*> wanted = signatureOf(declaration).parameters;
+    const auto found = std::find_if(all.begin(), all.end(), [&](const FunctionDecl* other) {
+        return other->body && other->name == declaration->name && signatureOf(other).parameters == wanted;
+    });
+    return found == all.end() ? nullptr : *found;
+}
+
+/// @return what it costs to pass the argument; IMPOSSIBLE where it cannot be passed
+int Overloads::argumentCost(const FunctionDecl* function, std::size_t position, const TypedExpr* argument) {
+    const Type* type = signatureOf(function).parameters[position];
+    if (implements(argument->type, type))
+        return 1;
+    const Direction direction = directionOf(function->parameters[position]);
+    const int there = direction == Direction::OUT ? 0 : conversionCost(argument, type);
+    if (there == IMPOSSIBLE_CONVERSION || direction == Direction::IN)
+        return there;
+    if (!isPlace(argument))
+        return IMPOSSIBLE_CONVERSION;
+    const TypedExpr result(Kind::LITERAL, argument->location, type);
+    const int back =
+        type->isUnsizedArray() ? conversionCost(argument, type) : conversionCost(&result, argument->type);
+    return back == IMPOSSIBLE_CONVERSION ? back : std::max(there, back);
+}
+
+bool Overloads::takes(const FunctionDecl* function, const Arguments& arguments) {
+    const Signature& signature = signatureOf(function);
+    if (!signature.result || arguments.size() > signature.parameters.size())
+        return false;
+    for (std::size_t i = 0; i < signature.parameters.size(); ++i) {
+        const bool isTaken = i < arguments.size()
+                                 ? argumentCost(function, i, arguments[i]) != IMPOSSIBLE_CONVERSION
+                                 : function->parameters[i]->initializer != nullptr;
+        if (!isTaken)
+            return false;
+    }
+    return true;
+}
+
+Overloads::Functions Overloads::cheapest(const Functions& functions, std::size_t position,
+                                         const TypedExpr* argument) {
+    Functions cheapest;
+    int best = 0;
+    for (const FunctionDecl* function : functions) {
+        const int cost = argumentCost(function, position, argument);
+        if (cheapest.empty() || cost < best) {
+            cheapest.clear();
+            best = cost;
+        }
+        if (cost == best)
+            cheapest.push_back(function);
+    }
+    return cheapest;
+}
+
+const FunctionDecl* Overloads::choose(const Functions& functions, const Arguments& arguments) {
+    Functions fitting;
+    for (const FunctionDecl* function : functions)
+        if (takes(function, arguments))
+            fitting.push_back(function);
+    for (std::size_t i = 0; i < arguments.size() && fitting.size() > 1; ++i)
+        fitting = cheapest(fitting, i, arguments[i]);
+    return fitting.empty() ? nullptr : fitting[0];
+}
+
+void Overloads::refuse(SourceLocation at, Name name, const Functions& functions, const Arguments& arguments) {
+    mResolution.diagnostics.error(at, noMatchingFunction(name, arguments));
+    for (const FunctionDecl* function : functions)
+        if (signatureOf(function).result)
+            mResolution.diagnostics.note(function->location, "candidate: " + describe(function) + ": " +
+                                                                 objection(function, arguments));
+}
+
+/// Why a function does not take the arguments.
+std::string Overloads::objection(const FunctionDecl* function, const Arguments& arguments) {
+    const std::vector<const Type*>& parameters = signatureOf(function).parameters;
+    for (std::size_t i = 0; i < std::min(arguments.size(), parameters.size()); ++i) {
+        if (argumentCost(function, i, arguments[i]) != IMPOSSIBLE_CONVERSION)
+            continue;
+        const std::string argument = "argument " + std::to_string(i + 1);
+        if (directionOf(function->parameters[i]) != Direction::IN && !isPlace(arguments[i]))
+            return argument + " cannot be written to";
+        return "no conversion of " + argument + " from '" + nameOf(arguments[i]->type) + "' to '" +
+               nameOf(parameters[i]) + "'";
+    }
+    return "it takes " + std::to_string(parameters.size()) +
+           (parameters.size() == 1 ? " argument" : " arguments");
+}
+
+std::string Overloads::describe(const FunctionDecl* declaration) {
+    const Signature& signature = signatureOf(declaration);
+    std::string text = nameOf(signature.result) + " " + std::string(declaration->name) + "(";
+    for (std::size_t i = 0; i < signature.parameters.size(); ++i) {
+        const Direction direction = directionOf(declaration->parameters[i]);
+        text += i == 0 ? "" : ", ";
+        text += direction == Direction::OUT ? "out " : direction == Direction::INOUT ? "inout " : "";
+        text += nameOf(signature.parameters[i]);
+    }
+    return text + ")";
+}
+
+bool implements(const Type* type, const Type* interface) {
+    return type->isStruct() && interface->isStruct() && type->structure->interface &&
+           type->structure->interface == interface->structure->declaration;
+}
+
+} // namespace cg

@@ -1,0 +1,71 @@
+#ifndef CG_COMPILER_RESOLVER_OVERLOADS_H
+#define CG_COMPILER_RESOLVER_OVERLOADS_H
+
+#include <Cg/Compiler/SourceLocation.h>
+#include <Cg/Compiler/TypedTree.h>
+
+#include <cstddef>
+#include <string>
+#include <unordered_map>
+#include <vector>
+
+namespace cg {
+
+class Declarations;
+class TypeResolver;
+struct Resolution;
+
+/// The types that a function is declared with.
+struct Signature {
+    std::vector<const Type*> parameters;
+    const Type* result = nullptr; ///< null after an error
+};
+
+/// Choice among the program's own functions of one name, as Cg makes it.
+class Overloads {
+public:
+    using Functions = std::vector<const FunctionDecl*>;
+    using Arguments = std::vector<TypedExpr*>;
+
+    Overloads(Resolution& resolution, const Declarations& declarations, TypeResolver& types)
+        : mResolution(resolution), mDeclarations(declarations), mTypes(types) {}
+
+    const Signature& signatureOf(const FunctionDecl* declaration);
+
+    /// The functions of that name that stand before the one being resolved, or else all of them; each once,
+    /// with its body where it has one.
+    Functions candidates(Name name);
+
+    /// The methods of that name; none where the type is no struct.
+    Functions methods(const Type* type, Name name) const;
+
+    /// @return the function with its body, or null
+    const FunctionDecl* definitionOf(const FunctionDecl* declaration);
+
+    /// Cg's choice: argument by argument from the left, only the functions that take it at the least cost
+    /// stay.
+    /// @return null where none takes the arguments
+    const FunctionDecl* choose(const Functions& functions, const Arguments& arguments);
+
+    /// Reports that none takes the arguments, with all that there would be.
+    void refuse(SourceLocation at, Name name, const Functions& functions, const Arguments& arguments);
+
+private:
+    int argumentCost(const FunctionDecl* function, std::size_t position, const TypedExpr* argument);
+    bool takes(const FunctionDecl* function, const Arguments& arguments);
+    Functions cheapest(const Functions& functions, std::size_t position, const TypedExpr* argument);
+    std::string objection(const FunctionDecl* function, const Arguments& arguments);
+    std::string describe(const FunctionDecl* declaration);
+
+    Resolution& mResolution;
+    const Declarations& mDeclarations;
+    TypeResolver& mTypes;
+    std::unordered_map<const FunctionDecl*, Signature> mSignatures;
+};
+
+/// The type is a struct that implements the interface.
+bool implements(const Type* type, const Type* interface);
+
+} // namespace cg
+
+#endif
