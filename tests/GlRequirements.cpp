@@ -1,9 +1,10 @@
+#include <fixture/ChildProcess.h>
+
 #include <GlRequirements.h>
 #include <HeadlessContext.h>
 
 #include <gtest/gtest.h>
 
-#include <sys/wait.h>
 #include <unistd.h>
 
 #include <cstdlib>
@@ -21,11 +22,7 @@ const std::string NO_CONTEXT = "no context: ";
 /// @param version  OpenGL version that it claims, null for its own
 /// @param without  extensions that are taken away
 std::string missingWith(const char* version, const std::string& without) {
-    int ends[2] = {};
-    if (pipe(ends) != 0)
-        throw std::runtime_error("no pipe");
-    const pid_t child = fork(); // a driver reads its environment once
-    if (child == 0) {
+    const ChildRun child = runChild([&](int output) { // a driver reads its environment once
         setenv("LIBGL_ALWAYS_SOFTWARE", "1", 1);
         setenv("GALLIUM_DRIVER", "llvmpipe", 1);
         setenv("MESA_EXTENSION_OVERRIDE", without.c_str(), 1);
@@ -41,17 +38,10 @@ std::string missingWith(const char* version, const std::string& without) {
         } catch (const std::runtime_error& error) {
             missing = NO_CONTEXT + error.what();
         }
-        _exit(write(ends[1], missing.data(), missing.size()) < 0 ? 1 : 0);
-    }
-    close(ends[1]);
-    std::string missing;
-    char part[1024];
-    for (ssize_t length = 0; (length = read(ends[0], part, sizeof part)) > 0;)
-        missing.append(part, static_cast<size_t>(length));
-    close(ends[0]);
-    int status = -1;
-    waitpid(child, &status, 0);
-    return status == 0 ? missing : "died with status " + std::to_string(status);
+        _exit(write(output, missing.data(), missing.size()) < 0 ? 1
+                                                                : 0); // without what the driver does at exit
+    });
+    return child.status == 0 ? child.text : "died with status " + std::to_string(child.status);
 }
 
 // Mesa lowers its version with an extension that the version demands; those that it cannot do without itself

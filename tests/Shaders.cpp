@@ -2,14 +2,13 @@
 #include <FwZel/VertexListPlane.h>
 
 #include <fixture/CgCalls.h>
+#include <fixture/ChildProcess.h>
 #include <fixture/FloatCanvas.h>
 #include <fixture/GlTest.h>
 #include <fixture/TemporaryFile.h>
 
-#include <sys/wait.h>
 #include <unistd.h>
 
-#include <cstdio>
 #include <cstdlib>
 #include <map>
 #include <memory>
@@ -285,14 +284,13 @@ TEST_F(Shaders, ProfilesHaveTheNamesOfTheirEnumerators) {
 // --- Ends of the process
 
 /// How a child process ended, with the messages that it logged: status, then a line each.
-void reportAndLeave(int status, void* pipeEnd) {
-    const int descriptor = *static_cast<int*>(pipeEnd);
+void reportAndLeave(int status, void* output) {
     std::ostringstream report;
     report << "exit " << status << '\n';
     for (const LogMessage& message : takeLog())
         report << message.level << ' ' << message.text;
     const std::string text = report.str();
-    if (write(descriptor, text.data(), text.size()) < 0)
+    if (write(*static_cast<int*>(output), text.data(), text.size()) < 0)
         _exit(99);
     _exit(status);
 }
@@ -300,25 +298,12 @@ void reportAndLeave(int status, void* pipeEnd) {
 /// Runs something in a child process and tells how it ended: by exit(), with its status and log, or not.
 template <class Action>
 std::string endOf(Action action) {
-    int ends[2] = {};
-    if (pipe(ends) != 0)
-        return "no pipe";
-    const pid_t child = fork();
-    if (child == 0) {
+    const ChildRun child = runChild([&action](int output) {
         takeLog();
-        on_exit(reportAndLeave, &ends[1]);
+        on_exit(reportAndLeave, &output);
         action();
-        _exit(0);
-    }
-    close(ends[1]);
-    std::string report;
-    char part[256];
-    for (ssize_t length = 0; (length = read(ends[0], part, sizeof part)) > 0;)
-        report.append(part, static_cast<size_t>(length));
-    close(ends[0]);
-    int status = 0;
-    waitpid(child, &status, 0);
-    return report.empty() ? "did not exit" : report;
+    });
+    return child.text.empty() ? "did not exit" : child.text;
 }
 
 /// Leaves a compiler error, and a listing, in the runtime; returns the listing.
