@@ -7,25 +7,13 @@
 #include <array>
 #include <limits>
 #include <optional>
-#include <unordered_set>
 
 namespace cg {
 
 namespace {
 
-/// Levels of statements, parentheses, operands on the right and lists within each other.
-constexpr int MAX_LEVELS = 250;
-
 /// Height of an expression's tree, which long sums make high without nesting.
 constexpr int MAX_HEIGHT = 600;
-
-/// Words that name nothing, wherever they stand.
-bool isKeyword(Name word) {
-    static const std::unordered_set<Name> KEYWORDS{"break",  "const",  "continue", "discard", "do",
-                                                   "else",   "false",  "for",      "if",      "return",
-                                                   "static", "struct", "true",     "typedef", "while"};
-    return KEYWORDS.count(word) != 0;
-}
 
 /// Words that may stand before `int` and mean no more than it does.
 bool isSizeWord(Name word) {
@@ -110,53 +98,10 @@ std::optional<UnaryOp> prefixOperator(TokenKind kind) {
     }
 }
 
-const char* spellingOf(TokenKind kind) {
-    switch (kind) {
-    case TokenKind::LEFT_PAREN:
-        return "'('";
-    case TokenKind::RIGHT_PAREN:
-        return "')'";
-    case TokenKind::LEFT_BRACKET:
-        return "'['";
-    case TokenKind::RIGHT_BRACKET:
-        return "']'";
-    case TokenKind::LEFT_BRACE:
-        return "'{'";
-    case TokenKind::RIGHT_BRACE:
-        return "'}'";
-    case TokenKind::SEMICOLON:
-        return "';'";
-    case TokenKind::COLON:
-        return "':'";
-    case TokenKind::ASSIGN:
-        return "'='";
-    default:
-        return "another word";
-    }
-}
-
-bool isOpening(TokenKind kind) {
-    return kind == TokenKind::LEFT_PAREN || kind == TokenKind::LEFT_BRACKET || kind == TokenKind::LEFT_BRACE;
-}
-
-bool isClosing(TokenKind kind) {
-    return kind == TokenKind::RIGHT_PAREN || kind == TokenKind::RIGHT_BRACKET ||
-           kind == TokenKind::RIGHT_BRACE;
-}
-
 } // namespace
 
 ExpressionParser::ExpressionParser(const std::vector<Token>& tokens, Arena& arena, Diagnostics& diagnostics)
-    : mTokens(tokens), mArena(arena), mDiagnostics(diagnostics), mTypes(arena), mScopes(mTypes) {}
-
-ExpressionParser::Level::Level(ExpressionParser& parser) : mParser(parser) {
-    if (parser.mLevels == MAX_LEVELS) {
-        mParser.mDiagnostics.error(parser.token().location,
-                                   "this is nested more than " + std::to_string(MAX_LEVELS) + " levels deep");
-        throw SyntaxError();
-    }
-    ++parser.mLevels;
-}
+    : TokenCursor(tokens, diagnostics), mArena(arena), mTypes(arena), mScopes(mTypes) {}
 
 void ExpressionParser::setHeight(int height) {
     mHeight = height;
@@ -165,81 +110,6 @@ void ExpressionParser::setHeight(int height) {
     mDiagnostics.error(token().location,
                        "this expression has more than " + std::to_string(MAX_HEIGHT) + " operators in a row");
     throw SyntaxError();
-}
-
-// ---------------------------------------------------------------------------------------------- tokens
-
-const Token& ExpressionParser::token(std::size_t ahead) const {
-    return mTokens[std::min(mAt + ahead, mTokens.size() - 1)];
-}
-
-void ExpressionParser::pass() {
-    if (mAt + 1 < mTokens.size())
-        ++mAt;
-}
-
-bool ExpressionParser::isAtWord(Name word, std::size_t ahead) const {
-    return token(ahead).kind == TokenKind::NAME && token(ahead).text == word;
-}
-
-bool ExpressionParser::take(TokenKind kind) {
-    if (!isAt(kind))
-        return false;
-    pass();
-    return true;
-}
-
-bool ExpressionParser::takeWord(Name word) {
-    if (!isAtWord(word))
-        return false;
-    pass();
-    return true;
-}
-
-void ExpressionParser::expect(TokenKind kind, const char* where) {
-    if (!take(kind))
-        fail(std::string(spellingOf(kind)) + " " + where);
-}
-
-Token ExpressionParser::expectName(const std::string& what) {
-    const Token name = token();
-    if (name.kind != TokenKind::NAME || isKeyword(name.text))
-        fail(what);
-    pass();
-    return name;
-}
-
-/// What is missing at the end of a line is missing there, not where the next word stands.
-void ExpressionParser::fail(const std::string& expected) {
-    const Token& found = token();
-    SourceLocation location = found.location;
-    if (mAt > 0) {
-        const Token& before = mTokens[mAt - 1];
-        const SourceLocation behind{before.location.file, before.location.line,
-                                    before.location.column + static_cast<std::uint32_t>(before.text.size())};
-        if (behind.file != location.file || behind.line < location.line)
-            location = behind;
-    }
-    const bool isEnd = found.kind == TokenKind::END;
-    mDiagnostics.error(location, "expected " + expected + ", found " +
-                                     (isEnd ? "the end of the program" : inQuotes(found.text)));
-    throw SyntaxError();
-}
-
-void ExpressionParser::skipBracketed() {
-    const Token opening = token();
-    std::size_t depth = 0;
-    do {
-        if (isOpening(token().kind))
-            ++depth;
-        else if (isClosing(token().kind))
-            --depth;
-        else if (isAt(TokenKind::END)) {
-            mDiagnostics.error(opening.location, inQuotes(opening.text) + " is never closed");
-            throw SyntaxError();
-        }
-        pass();
-    } while (depth > 0);
 }
 
 // ----------------------------------------------------------------------------------------------- types
@@ -314,21 +184,6 @@ std::vector<Expr*> ExpressionParser::parseDimensions() {
         expect(TokenKind::RIGHT_BRACKET, "after an array's size");
     }
     return dimensions;
-}
-
-std::size_t ExpressionParser::behindBrackets(std::size_t ahead) const {
-    std::size_t depth = 0;
-    for (std::size_t at = ahead;; ++at) {
-        const TokenKind kind = token(at).kind;
-        if (kind == TokenKind::LEFT_BRACKET)
-            ++depth;
-        else if (depth == 0)
-            return at;
-        else if (kind == TokenKind::RIGHT_BRACKET)
-            --depth;
-        else if (kind == TokenKind::END || kind == TokenKind::SEMICOLON || kind == TokenKind::LEFT_BRACE)
-            return ahead;
-    }
 }
 
 // ----------------------------------------------------------------------------------------- expressions
