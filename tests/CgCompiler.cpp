@@ -239,6 +239,50 @@ TEST(CgParameters, AreTheGlobalsWhoseInitialValuesAreKnown) {
     EXPECT_EQ(wanted, parametersOf(program + "float4 main() : COLOR { return 1; }\n"));
 }
 
+/// A constant of the program that is one in GLSL costs nothing at run time; what else GLSL takes as such a
+/// value fails to compile.
+TEST(CgGlobals, AreConstantsWhereGlslTakesTheirValuesAsSuch) {
+    struct Global {
+        const char* value;
+        bool isConstant;
+    };
+    constexpr Global GLOBALS[] = {{"-2.0", true},
+                                  {"abs(-2.0) + OTHER", true},
+                                  {"(1, 2)", false},
+                                  {"rcp(4.0)", false},
+                                  {"tex2D(s, 0.5).x", false},
+                                  {"tex2Dfetch(s, int4(0)).x", false},
+                                  {"ddx(2.0)", false},
+                                  {"fwidth(2.0)", false},
+                                  {"mvp[0].x", false},
+                                  {"given", false},
+                                  {"made", false},
+                                  {"abs(float2x2(1, 2, 3, 4))[0].x", false},
+                                  {"made++", false},
+                                  {"(made = 2)", false},
+                                  {"two()", false},
+                                  {"TABLE[1]", true},
+                                  {"7.0 * (1 + 2)", true},
+                                  {"OTHER > 1 ? 2.0 : 3.0", true},
+                                  {"float2(1, 2).y", true}};
+    std::string program = "uniform sampler2D s; uniform float4x4 mvp : state.matrix.mvp;\n"
+                          "uniform float given; static float made = given; static const float OTHER = 2;\n"
+                          "static const float TABLE[2] = { 1, 2 }; float two() { return 2; }\n";
+    std::string sum = "0";
+    for (const Global& global : GLOBALS) {
+        const std::string name = "c" + std::to_string(&global - GLOBALS);
+        program += "static const float " + name + " = " + global.value + ";\n";
+        sum += " + " + name;
+    }
+    const cg::CompileResult result =
+        compileFragment(program + "float4 main() : COLOR { return " + sum + "; }\n");
+    ASSERT_TRUE(result.ok) << result.listing;
+    for (const Global& global : GLOBALS)
+        EXPECT_EQ(global.isConstant, result.glsl.find("const float c" + std::to_string(&global - GLOBALS) +
+                                                      " = ") != std::string::npos)
+            << global.value;
+}
+
 /// Each constant is made of the one before.
 TEST(CgParameters, EndWithChainsOfTooManyConstants) {
     const auto chain = [](int length) {

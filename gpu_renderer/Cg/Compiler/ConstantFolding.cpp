@@ -165,8 +165,6 @@ private:
         Values values;
         for (int i = 0; i < expression->type->columns; ++i) {
             const std::size_t component = expression->components[static_cast<std::size_t>(i)];
-            if (component >= object->size())
-                return std::nullopt;
             values.push_back((*object)[component]);
         }
         return values;
