@@ -2,6 +2,7 @@
 #define FUZZ_FUZZEDTEXTURE_H
 
 #include <fixture/GuardedTexture.h>
+#include <fixture/TexArgs.h>
 
 #include <epoxy/gl.h>
 
@@ -17,7 +18,7 @@ inline void require(bool isTrue) {
 /// A texture for the readers to fill, without OpenGL.
 class FuzzedTexture {
 public:
-    FuzzedTexture() : mGuarded((takeOpenGlAway(), smallest())) {}
+    FuzzedTexture() : mGuarded((takeOpenGlAway(), texArgs(1, 1))) {}
 
     Texture& texture() { return mGuarded.texture; }
 
@@ -38,13 +39,6 @@ public:
             untouched = row + rowBytes;
         }
         return hasNothingFrom(untouched, mGuarded.memory().size());
-    }
-
-    static Texture::TexArgs smallest() {
-        Texture::TexArgs args;
-        Texture::setDefaultValue(args);
-        args.width = args.height = args.pitchInPix = 1;
-        return args;
     }
 
 private:

@@ -1,14 +1,14 @@
 #include "FuzzedReader.h"
 
+#include <fixture/TexArgs.h>
+
 #include <FwZel/PngFile.h>
 
 namespace {
 
 Texture::TexArgs argsOf(uint8_t choice, uint32_t /*fileWidth*/, uint32_t /*fileHeight*/) {
-    Texture::TexArgs args = FuzzedTexture::smallest();
     const bool isSmall = (choice & 1) != 0; // than most pictures
-    args.width = isSmall ? 3 : 9;
-    args.height = isSmall ? 2 : 7;
+    Texture::TexArgs args = isSmall ? texArgs(3, 2) : texArgs(9, 7);
     args.pitchInPix = (choice & 2) != 0 ? args.width + 3 : args.width - 1;
     args.numColours = (choice & 4) != 0 ? 3 : FuzzedReader::COMPONENTS;
     args.numBytesPerColour = (choice & 8) != 0 ? 2 : 1;

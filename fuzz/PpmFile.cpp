@@ -1,5 +1,7 @@
 #include "FuzzedReader.h"
 
+#include <fixture/TexArgs.h>
+
 #include <FwZel/PpmFile.h>
 
 namespace {
@@ -7,11 +9,9 @@ namespace {
 constexpr uint32_t LARGEST = 64; // a texture of the file's own size is made up to here
 
 Texture::TexArgs argsOf(uint8_t choice, uint32_t fileWidth, uint32_t fileHeight) {
-    Texture::TexArgs args = FuzzedTexture::smallest();
-    if (fileWidth <= LARGEST)
-        args.width = fileWidth;
-    args.height = fileHeight <= LARGEST && (choice & 1) != 0 ? fileHeight : 9;
-    args.pitchInPix = args.width + (choice >> 1 & 1);
+    Texture::TexArgs args = texArgs(fileWidth <= LARGEST ? fileWidth : 1,
+                                    fileHeight <= LARGEST && (choice & 1) != 0 ? fileHeight : 9);
+    args.pitchInPix += choice >> 1 & 1;
     args.numBytesPerColour = (choice & 4) != 0 ? 2 : 1;
     args.isInterlaced = (choice & 8) != 0;
     return args;

@@ -2,6 +2,7 @@
 #include <fixture/FloatCanvas.h>
 #include <fixture/GlTest.h>
 #include <fixture/PictureFiles.h>
+#include <fixture/TexArgs.h>
 
 #include <Cg/cgGL.h>
 #include <FwZel/FWDebugFont.h>
@@ -97,10 +98,7 @@ Messages ofTexture(bool isUpload, int firstBuffer = 0) {
 }
 
 Texture::TexArgs textureArgs(bool isPbo, uint32_t access) {
-    Texture::TexArgs args;
-    Texture::setDefaultValue(args);
-    args.width = args.pitchInPix = 13; // as the pictures
-    args.height = 11;
+    Texture::TexArgs args = texArgs(13, 11); // as the pictures
     args.numBuffers = 2;
     args.isFBO = true;
     args.isPBO = isPbo;

@@ -1,5 +1,6 @@
 #include <fixture/GlTest.h>
 #include <fixture/PictureFiles.h>
+#include <fixture/TexArgs.h>
 
 #include <FwZel/Texture.h>
 #include <FwZel/VideoTestImage.h>
@@ -20,10 +21,7 @@ protected:
 
 /// Describes another picture than any file of these tests holds.
 Texture::TexArgs otherArgs() {
-    Texture::TexArgs args;
-    Texture::setDefaultValue(args);
-    args.width = 20;
-    args.height = 6;
+    Texture::TexArgs args = texArgs(20, 6);
     args.pitchInPix = 24;
     args.numBuffers = 4;
     return args;

@@ -3,6 +3,7 @@
 #include <fixture/GlTest.h>
 #include <fixture/PictureFiles.h>
 #include <fixture/SwappedEntryPoint.h>
+#include <fixture/TexArgs.h>
 
 #include <Cg/cgGL.h>
 #include <FwZel/FWDebugFont.h>
@@ -264,10 +265,7 @@ protected:
 };
 
 Texture::TexArgs textureArgs(uint32_t access, bool isPbo = true) {
-    Texture::TexArgs args;
-    Texture::setDefaultValue(args);
-    args.width = args.pitchInPix = 8;
-    args.height = 6;
+    Texture::TexArgs args = texArgs(8, 6);
     args.isPBO = isPbo;
     args.isFBO = args.isMipMapped = isPbo;
     args.pboAccessType = access;

@@ -6,6 +6,7 @@
 #include <fixture/GlTest.h>
 #include <fixture/GuardedTexture.h>
 #include <fixture/PictureFiles.h>
+#include <fixture/TexArgs.h>
 
 #include <algorithm>
 #include <atomic>
@@ -71,14 +72,6 @@ size_t heapBytesOf(Work work) {
     return heapBytes - before;
 }
 
-Texture::TexArgs argsOf(uint32_t width, uint32_t height) {
-    Texture::TexArgs args;
-    Texture::setDefaultValue(args);
-    args.width = args.pitchInPix = width;
-    args.height = height;
-    return args;
-}
-
 /// All that is ever done with a file: its size, a fill, and what is said of it.
 template <class Query, class Fill>
 size_t heapBytesOfReading(const TemporaryFile& file, GuardedTexture& guarded, Query query, Fill fill) {
@@ -108,7 +101,7 @@ constexpr uint32_t EDGES[] = {0,         1,         2,        255,        256,  
 TEST_F(HostileFiles, DeclaredSizesTakeNoMemoryOrLittle) {
     const TemporaryFile png("picture.png");
     const TemporaryFile ppm("picture.ppm");
-    GuardedTexture small(argsOf(4, 3));
+    GuardedTexture small(texArgs(4, 3));
     const Bytes whole = PngPicture{4, 3, 6, 16, false, false}.encode();
     size_t fitting = 0;
     for (const uint32_t width : EDGES)
@@ -131,7 +124,7 @@ TEST_F(HostileFiles, DeclaredSizesTakeNoMemoryOrLittle) {
             if (!isReadable || width > 4000000) {
                 EXPECT_LT(heapBytesOfPpm(ppm, small), FOR_A_REFUSAL);
             } else {
-                GuardedTexture asWide(argsOf(width, 2));
+                GuardedTexture asWide(texArgs(width, 2));
                 EXPECT_LT(heapBytesOfPpm(ppm, asWide), FOR_READING);
             }
         }
@@ -141,7 +134,7 @@ TEST_F(HostileFiles, DeclaredSizesTakeNoMemoryOrLittle) {
 TEST_F(HostileFiles, CutAndChangedFilesTakeLittleMemory) {
     const TemporaryFile png("picture.png");
     const TemporaryFile ppm("picture.ppm");
-    GuardedTexture guarded(argsOf(9, 7));
+    GuardedTexture guarded(texArgs(9, 7));
     const auto takesLittle = [&](const Bytes& asPng) {
         png.write(asPng);
         return heapBytesOfPng(png, guarded) < FOR_READING;

@@ -1,5 +1,6 @@
 #include <fixture/CapturedLog.h>
 #include <fixture/TemporaryFile.h>
+#include <fixture/TexArgs.h>
 
 #include <FrameLoop.h>
 #include <HeadlessSurface.h>
@@ -89,10 +90,7 @@ protected:
     }
     void upload(int frame) override {
         const auto number = static_cast<uint32_t>(frame);
-        Texture::TexArgs args;
-        Texture::setDefaultValue(args);
-        args.width = args.pitchInPix = 8 + number % 3 * 8;
-        args.height = 8 + number % 2 * 8;
+        Texture::TexArgs args = texArgs(8 + number % 3 * 8, 8 + number % 2 * 8);
         args.isPBO = number % 2 != 0;
         args.isMipMapped = number % 3 == 0;
         args.isFBO = number % 5 == 0;

@@ -1,5 +1,6 @@
 #include <fixture/GlTest.h>
 #include <fixture/TemporaryFile.h>
+#include <fixture/TexArgs.h>
 #include <fixture/TextureCalls.h>
 
 #include <FwZel/Texture.h>
@@ -21,10 +22,7 @@ namespace {
 using Calls = std::vector<std::string>;
 
 Texture::TexArgs pboArgs(uint32_t access = GL_WRITE_ONLY, uint32_t numBuffers = 2) {
-    Texture::TexArgs args;
-    Texture::setDefaultValue(args);
-    args.width = args.pitchInPix = 16;
-    args.height = 8;
+    Texture::TexArgs args = texArgs(16, 8);
     args.isPBO = true;
     args.numBuffers = numBuffers;
     args.pboAccessType = access;

@@ -6,6 +6,7 @@
 #include <fixture/GlTest.h>
 #include <fixture/GuardedTexture.h>
 #include <fixture/PictureFiles.h>
+#include <fixture/TexArgs.h>
 
 #include <algorithm>
 #include <cstring>
@@ -18,10 +19,7 @@ constexpr int RGB_ALPHA = 6;
 class PngFiles : public GlTest {};
 
 Texture::TexArgs argsOf(uint32_t width, uint32_t height, uint32_t bytesPerColour = 1) {
-    Texture::TexArgs args;
-    Texture::setDefaultValue(args);
-    args.width = args.pitchInPix = width;
-    args.height = height;
+    Texture::TexArgs args = texArgs(width, height);
     args.numBytesPerColour = bytesPerColour;
     return args;
 }

@@ -6,6 +6,7 @@
 #include <fixture/GlTest.h>
 #include <fixture/GuardedTexture.h>
 #include <fixture/TemporaryFile.h>
+#include <fixture/TexArgs.h>
 
 #include <cstring>
 
@@ -75,10 +76,7 @@ Bytes expectedMemory(const PpmPicture& picture, const GuardedTexture& guarded, u
 }
 
 Texture::TexArgs argsOf(uint32_t width, uint32_t height, const Form& form = {1, false, 0}) {
-    Texture::TexArgs args;
-    Texture::setDefaultValue(args);
-    args.width = args.pitchInPix = width;
-    args.height = height;
+    Texture::TexArgs args = texArgs(width, height);
     args.numBytesPerColour = form.bytesPerColour;
     return args;
 }

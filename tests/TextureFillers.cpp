@@ -1,4 +1,5 @@
 #include <fixture/GlTest.h>
+#include <fixture/TexArgs.h>
 
 #include <FwZel/Texture.h>
 #include <FwZel/VideoTestImage.h>
@@ -18,10 +19,7 @@ constexpr uint32_t HEIGHT = 23;
 constexpr uint32_t PITCH = 67;
 
 Texture::TexArgs arguments(bool isFp16 = false) {
-    Texture::TexArgs args;
-    Texture::setDefaultValue(args);
-    args.width = WIDTH;
-    args.height = HEIGHT;
+    Texture::TexArgs args = texArgs(WIDTH, HEIGHT);
     args.pitchInPix = PITCH;
     args.numBuffers = 2;
     args.isFp16 = isFp16;

@@ -1,4 +1,5 @@
 #include <fixture/GlTest.h>
+#include <fixture/TexArgs.h>
 
 #include <FwZel/Texture.h>
 #include <FwZel/VideoTestImage.h>
@@ -12,12 +13,7 @@
 namespace {
 
 Texture::TexArgs smallArgs() {
-    Texture::TexArgs args;
-    Texture::setDefaultValue(args);
-    args.width = 12;
-    args.height = 10;
-    args.pitchInPix = 12;
-    return args;
+    return texArgs(12, 10);
 }
 
 using TextureLayout = GlTest;

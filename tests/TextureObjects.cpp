@@ -1,4 +1,5 @@
 #include <fixture/GlTest.h>
+#include <fixture/TexArgs.h>
 #include <fixture/TextureCalls.h>
 
 #include <FwZel/Texture.h>
@@ -9,11 +10,7 @@ namespace {
 using Calls = std::vector<std::string>;
 
 Texture::TexArgs smallArgs() {
-    Texture::TexArgs args;
-    Texture::setDefaultValue(args);
-    args.width = args.pitchInPix = 12;
-    args.height = 10;
-    return args;
+    return texArgs(12, 10);
 }
 
 Calls& operator+=(Calls& calls, const Calls& more) {

@@ -1,4 +1,5 @@
 #include <fixture/GlTest.h>
+#include <fixture/TexArgs.h>
 #include <fixture/TextureCalls.h>
 
 #include <FwZel/Texture.h>
@@ -12,10 +13,7 @@ using Calls = std::vector<std::string>;
 using Bytes = std::vector<uint8_t>;
 
 Texture::TexArgs smallArgs(bool isPBO, uint32_t access) {
-    Texture::TexArgs args;
-    Texture::setDefaultValue(args);
-    args.width = args.pitchInPix = 20;
-    args.height = 14;
+    Texture::TexArgs args = texArgs(20, 14);
     args.numBuffers = 2;
     args.isPBO = isPBO;
     args.isFBO = true;
