@@ -42,7 +42,8 @@ TypedStmt* BranchSamplers::resolve(SourceLocation at, TypedExpr* condition,
     return result;
 }
 
-/// @param whenTrue,whenFalse  what the branches assign, or null
+/// @param whenTrue   what the first branch assigns, or null
+/// @param whenFalse  what the other one does
 void BranchSamplers::choose(SourceLocation at, TypedExpr* condition, Variable* variable, TypedExpr* whenTrue,
                             TypedExpr* whenFalse) {
     // Where it stood for nothing before, it stands for whatever the other branch gives.

@@ -20,8 +20,9 @@ public:
         : mResolution(resolution), mAliases(aliases), mLists(lists) {}
 
     /// Resolves an `if`.
-    /// @param condition              null after an error
-    /// @param thenBranch,elseBranch  resolve the branches
+    /// @param condition   null after an error
+    /// @param thenBranch  resolves that branch
+    /// @param elseBranch  resolves that branch, or gives null
     /// @return null after an error
     TypedStmt* resolve(SourceLocation at, TypedExpr* condition, const std::function<TypedStmt*()>& thenBranch,
                        const std::function<TypedStmt*()>& elseBranch);

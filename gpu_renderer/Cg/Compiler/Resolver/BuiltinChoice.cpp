@@ -154,7 +154,7 @@ const Type* ChosenBuiltin::typeOf(const BuiltinOperand& operand, const TypeTable
     case Operand::Kind::SQUARE:
         return matrix;
     case Operand::Kind::TRANSPOSED:
-        return types.matrix(matrix->scalar, matrix->columns, matrix->rows);
+        return matrix ? types.matrix(matrix->scalar, matrix->columns, matrix->rows) : nullptr;
     }
     return nullptr;
 }

@@ -19,8 +19,8 @@ struct ChosenBuiltin {
     const BuiltinFunction* function = nullptr; ///< null where none takes the arguments
     int size = 1;
     Scalar scalar = Scalar::BOOL;
-    const Type* matrix = nullptr;
-    int rows = 0; ///< of generic operands that are matrices; 0 where they are none
+    const Type* matrix = nullptr; ///< null where the function takes none
+    int rows = 0;                 ///< of generic operands that are matrices; 0 where they are none
     int columns = 0;
 
     /// The type that an operand of the function has in this call.

@@ -52,7 +52,7 @@ TypedExpr* Calls::callMember(const MemberExpr* callee, const Arguments& argument
     const SourceLocation at = callee->location;
     const Name name = callee->name;
     if (object->type->isArray() && name == "length" && arguments.empty())
-        return mResolution.build.literal(at, mResolution.types.scalar(Scalar::INT), object->type->length);
+        return mResolution.number(at, object->type->length);
     const Overloads::Functions methods = mOverloads.methods(object->type, name);
     if (methods.empty()) {
         mResolution.diagnostics.error(at, "'" + nameOf(object->type) + "' has no method " + inQuotes(name));

@@ -140,8 +140,7 @@ TypedExpr* ChosenCalls::chooseByIndex(TypedExpr* call, std::size_t position) {
             result = one;
             continue;
         }
-        TypedExpr* number = build.literal(index->location, mResolution.types.scalar(Scalar::INT), i);
-        TypedExpr* isIt = build.binary(index->location, BinaryOp::EQUAL, known, number);
+        TypedExpr* isIt = mResolution.isNumber(index->location, known, i);
         result = build.make(Kind::CONDITIONAL, call->location, call->type, {isIt, one, result});
     }
     return mResolution.inOrder(call->location, preparation, result);

@@ -4,23 +4,21 @@
 #include <Cg/Compiler/SourceLocation.h>
 #include <Cg/Compiler/TypedTree.h>
 
-#include <cstddef>
-#include <map>
-#include <unordered_map>
 #include <vector>
 
 namespace cg {
 
+class InitializerLists;
 class Recursion;
 struct Resolution;
 
-/// Initial values: lists in braces, and constructors that read as such lists.
+/// Initial values, and constructors that read as lists of them.
 ///
 /// Operations return null after an error.
 class Initializers {
 public:
-    Initializers(Resolution& resolution, Recursion& recursion)
-        : mResolution(resolution), mRecursion(recursion) {}
+    Initializers(Resolution& resolution, Recursion& recursion, InitializerLists& lists)
+        : mResolution(resolution), mRecursion(recursion), mLists(lists) {}
 
     /// @param type  an unsized array gets its length here
     TypedExpr* value(const Type*& type, const Expr* expr);
@@ -34,27 +32,10 @@ public:
     /// `Light(position, colour)`
     TypedExpr* structure(SourceLocation at, const Type* type, const std::vector<Expr*>& arguments);
 
-    /// @param list  what a list has become
-    /// @return the sampler that it gave a field of its struct: such values have no place in the list; or null
-    TypedExpr* listedSampler(const TypedExpr* list, std::size_t field) const;
-
 private:
-    class Cursor;
-
-    TypedExpr* fromList(const Type* type, const InitListExpr* list);
-    const Type* sizedByList(const Type* type, const InitListExpr* list);
-    TypedExpr* nextValue(Cursor& cursor);
-    TypedExpr* fill(const Type* type, Cursor& cursor);
-    std::vector<const Type*> piecesOf(const Type* type, const Cursor& cursor) const;
-    TypedExpr* fillPieces(SourceLocation at, const Type* type, Cursor& cursor);
-    bool fillSampler(TypedExpr* whole, std::size_t field, Cursor& cursor);
-    TypedExpr* fillNumber(const Type* type, Cursor& cursor);
-    TypedExpr* gatherNumber(SourceLocation at, const Type* type, Cursor& cursor);
-    int takeComponents(SourceLocation at, int wanted, Cursor& cursor, std::vector<TypedExpr*>& parts);
-
     Resolution& mResolution;
     Recursion& mRecursion;
-    std::unordered_map<const TypedExpr*, std::map<std::size_t, TypedExpr*>> mListedSamplers; ///< by field
+    InitializerLists& mLists;
 };
 
 } // namespace cg

@@ -50,14 +50,14 @@ void LocalDeclarations::declareVariable(const VariableDecl* declaration, Stateme
         mResolution.makeVariable(Variable::Storage::LOCAL, declaration->name, type, declaration);
     context.isDeclaredUsed = false;
     TypedExpr* value = nullptr;
-    if (type && declaration->initializer) {
-        if (isOpaque(type))
-            giveSampler(variable, out);
-        else
-            value = initialValue(variable);
+    bool isKnown = type != nullptr;
+    if (type && declaration->initializer && isOpaque(type)) {
+        giveSampler(variable, out);
+    } else if (type && declaration->initializer) {
+        value = initialValue(variable);
+        isKnown = value != nullptr;
     }
-    const bool isLost = !type || (declaration->initializer && !isOpaque(type) && !value);
-    const bool isSized = !isLost && checkSize(declaration, variable->type);
+    const bool isSized = isKnown && checkSize(declaration, variable->type);
     if (!variable->type)
         variable->type = mResolution.types.scalar(Scalar::FLOAT); // the name is known at least
     variable->isConst = declaration->qualifiers.isConst;

@@ -32,7 +32,7 @@ TypedExpr* Parts::member(SourceLocation at, TypedExpr* object, Name name) {
     if (type->isStruct())
         return field(at, object, name);
     if (type->isArray() && name == "length")
-        return mResolution.build.literal(at, mResolution.types.scalar(Scalar::INT), type->length);
+        return mResolution.number(at, type->length);
     if (type->isMatrix())
         return elementsOf(at, object, name);
     if (type->isScalarOrVector())

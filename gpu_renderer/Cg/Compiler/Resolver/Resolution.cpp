@@ -51,8 +51,16 @@ TypedStmt* Resolution::makeStatement(TypedStmt::Kind kind, TypedExpr* expression
     return statement;
 }
 
+TypedExpr* Resolution::number(SourceLocation at, int value) {
+    return build.literal(at, types.scalar(Scalar::INT), value);
+}
+
+TypedExpr* Resolution::isNumber(SourceLocation at, TypedExpr* value, int number) {
+    return build.binary(at, BinaryOp::EQUAL, value, this->number(at, number));
+}
+
 TypedExpr* Resolution::nothing(SourceLocation at) {
-    return build.literal(at, types.scalar(Scalar::INT), 0);
+    return number(at, 0);
 }
 
 CallChange::CallChange(Resolution& resolution, FunctionContext inner)

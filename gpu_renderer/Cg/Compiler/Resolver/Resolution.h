@@ -34,6 +34,11 @@ struct Resolution {
 
     TypedStmt* makeStatement(TypedStmt::Kind kind, TypedExpr* expression = nullptr);
 
+    TypedExpr* number(SourceLocation at, int value);
+
+    /// `value == number`
+    TypedExpr* isNumber(SourceLocation at, TypedExpr* value, int number);
+
     /// What stands for an expression that leaves nothing in GLSL.
     TypedExpr* nothing(SourceLocation at);
 

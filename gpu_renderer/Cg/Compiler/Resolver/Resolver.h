@@ -11,6 +11,7 @@
 #include <Cg/Compiler/Resolver/ExpressionResolver.h>
 #include <Cg/Compiler/Resolver/FunctionCalls.h>
 #include <Cg/Compiler/Resolver/Globals.h>
+#include <Cg/Compiler/Resolver/InitializerLists.h>
 #include <Cg/Compiler/Resolver/Initializers.h>
 #include <Cg/Compiler/Resolver/Instances.h>
 #include <Cg/Compiler/Resolver/LocalDeclarations.h>
@@ -61,6 +62,7 @@ private:
     // What the program declares
     Declarations mDeclarations;
     TypeResolver mTypes;
+    InitializerLists mInitializerLists;
     Initializers mInitializers;
     Globals mGlobals;
     Overloads mOverloads;

@@ -4,7 +4,7 @@
 #include <Cg/Compiler/ConversionCost.h>
 #include <Cg/Compiler/Diagnostics.h>
 #include <Cg/Compiler/Resolver/Globals.h>
-#include <Cg/Compiler/Resolver/Initializers.h>
+#include <Cg/Compiler/Resolver/InitializerLists.h>
 #include <Cg/Compiler/Resolver/Recursion.h>
 #include <Cg/Compiler/Resolver/Resolution.h>
 #include <Cg/Compiler/Resolver/SamplerAliases.h>
@@ -115,7 +115,7 @@ TypedExpr* SamplerAssignments::giveListed(SourceLocation at, Variable* root, con
         const std::string way = path + "." + std::string(fields[i].name);
         TypedExpr* effect = nullptr;
         if (isOpaque(fields[i].type)) {
-            if (TypedExpr* sampler = mInitializers.listedSampler(list, i))
+            if (TypedExpr* sampler = mInitializerLists.sampler(list, i))
                 effect = give(at, mPieces.piece(root, way, fields[i].type), sampler);
         } else if (next < list->operands.size()) {
             const TypedExpr* inner = list->operands[next++];

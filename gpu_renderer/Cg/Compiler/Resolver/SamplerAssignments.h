@@ -11,7 +11,7 @@
 namespace cg {
 
 class Globals;
-class Initializers;
+class InitializerLists;
 class Recursion;
 class SamplerAliases;
 class SamplerLists;
@@ -22,10 +22,10 @@ struct Resolution;
 class SamplerAssignments {
 public:
     SamplerAssignments(Resolution& resolution, Recursion& recursion, Globals& globals,
-                       const Initializers& initializers, SamplerAliases& aliases, SamplerPieces& pieces,
-                       SamplerLists& lists)
-        : mResolution(resolution), mRecursion(recursion), mGlobals(globals), mInitializers(initializers),
-          mAliases(aliases), mPieces(pieces), mLists(lists) {}
+                       const InitializerLists& initializerLists, SamplerAliases& aliases,
+                       SamplerPieces& pieces, SamplerLists& lists)
+        : mResolution(resolution), mRecursion(recursion), mGlobals(globals),
+          mInitializerLists(initializerLists), mAliases(aliases), mPieces(pieces), mLists(lists) {}
 
     /// Where an assignment puts samplers, and not what stands there: a variable, a member or an element.
     /// @return null for other places, and after an error that resolving the place as an expression reports
@@ -58,7 +58,7 @@ private:
     Resolution& mResolution;
     Recursion& mRecursion;
     Globals& mGlobals;
-    const Initializers& mInitializers;
+    const InitializerLists& mInitializerLists;
     SamplerAliases& mAliases;
     SamplerPieces& mPieces;
     SamplerLists& mLists;

@@ -17,7 +17,6 @@ using Kind = TypedExpr::Kind;
 } // namespace
 
 TypedExpr* SamplerLists::element(SourceLocation at, TypedExpr* list, TypedExpr* index) {
-    TypedBuilder& build = mResolution.build;
     const auto position = constantValue(index);
     TypedExpr* preparation = nullptr;
     TypedExpr* known = position ? index : mResolution.once(index, preparation);
@@ -34,11 +33,10 @@ TypedExpr* SamplerLists::element(SourceLocation at, TypedExpr* list, TypedExpr* 
             result = sampler;
             continue;
         }
-        TypedExpr* number = build.literal(at, mResolution.types.scalar(Scalar::INT), i);
-        TypedExpr* condition = build.binary(at, BinaryOp::EQUAL, known, number);
+        TypedExpr* condition = mResolution.isNumber(at, known, i);
         if (i == 0)
             condition = mResolution.inOrder(at, preparation, condition);
-        result = build.conditional(at, condition, sampler, result);
+        result = mResolution.build.conditional(at, condition, sampler, result);
         if (!result)
             return nullptr;
     }

@@ -51,8 +51,7 @@ TypedExpr* SamplerPieces::flatIndex(SourceLocation at, const std::vector<const T
         TypedExpr* part = element->operands[1];
         if (index) {
             const int length = element->operands[0]->type->length;
-            index = build.binary(at, BinaryOp::MULTIPLY, index,
-                                 build.literal(at, mResolution.types.scalar(Scalar::INT), length));
+            index = build.binary(at, BinaryOp::MULTIPLY, index, mResolution.number(at, length));
             index = build.binary(at, BinaryOp::ADD, index, part);
         } else {
             index = part;

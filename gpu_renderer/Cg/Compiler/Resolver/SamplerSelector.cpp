@@ -58,9 +58,7 @@ TypedExpr* SamplerSelector::choice(SourceLocation at, const Type* type) const {
     TypedBuilder& build = mResolution->build;
     TypedExpr* choice = mSamplers.back();
     for (std::size_t i = mSamplers.size() - 1; i-- > 0;) {
-        TypedExpr* position =
-            build.literal(at, mResolution->types.scalar(Scalar::INT), static_cast<double>(i));
-        TypedExpr* isIt = build.binary(at, BinaryOp::EQUAL, build.variable(at, mNumber), position);
+        TypedExpr* isIt = mResolution->isNumber(at, build.variable(at, mNumber), static_cast<int>(i));
         choice = build.make(Kind::CONDITIONAL, at, type, {isIt, mSamplers[i], choice});
     }
     return choice;
@@ -77,8 +75,7 @@ TypedExpr* SamplerSelector::numberOf(SourceLocation at, TypedExpr* sampler) {
         return isSameSampler(known, sampler);
     });
     if (found != mSamplers.end())
-        return mResolution->build.literal(at, mResolution->types.scalar(Scalar::INT),
-                                          static_cast<double>(found - mSamplers.begin()));
+        return mResolution->number(at, static_cast<int>(found - mSamplers.begin()));
     if (isAnyElement(sampler))
         return numberOfElement(at, sampler);
     mResolution->diagnostics.error(at, "this sampler cannot be assigned in a loop or a switch");
@@ -86,20 +83,17 @@ TypedExpr* SamplerSelector::numberOf(SourceLocation at, TypedExpr* sampler) {
 }
 
 TypedExpr* SamplerSelector::numberOfElement(SourceLocation at, TypedExpr* element) {
-    TypedBuilder& build = mResolution->build;
     TypedExpr* array = element->operands[0];
     TypedExpr* result = nullptr;
     for (int i = array->type->length - 1; i >= 0; --i) {
-        TypedExpr* number = numberOf(at, build.element(at, array, i));
+        TypedExpr* number = numberOf(at, mResolution->build.element(at, array, i));
         if (!number)
             return nullptr;
         if (!result) {
             result = number;
             continue;
         }
-        TypedExpr* position = build.literal(at, mResolution->types.scalar(Scalar::INT), i);
-        TypedExpr* isIt = build.binary(at, BinaryOp::EQUAL, element->operands[1], position);
-        result = chosen(at, isIt, number, result);
+        result = chosen(at, mResolution->isNumber(at, element->operands[1], i), number, result);
     }
     return result;
 }
