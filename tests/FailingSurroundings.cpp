@@ -326,7 +326,7 @@ Scenario onShader(const char* name, Operation operation) {
 Scenario newCgContext() {
     return {"a new shared Cg context",
             [](Exposed& exposed) {
-                const CGcontext shared = Shader::mCgContext;
+                auto* const shared = Shader::mCgContext;
                 exposed([] { Shader::initCgContext(); });
                 if (Shader::mCgContext != shared)
                     cgDestroyContext(Shader::mCgContext);
@@ -446,7 +446,7 @@ TEST_F(FailingSurroundings, EveryCallOfEveryOperationFailsInItsTurn) {
         for (const Call call : EVERY_CALL) {
             // A compilation allocates thousands of times: beyond the first hundred some numbers are passed
             // over.
-            for (int number = 0, step = 1;; number += step = 1 + number / 100) {
+            for (int number = 0;; number += 1 + number / 100) {
                 SCOPED_TRACE(std::string(scenario.name) + ": " + nameOf(call) + " number " +
                              std::to_string(number));
                 takeLog();
