@@ -119,8 +119,9 @@ constexpr ComponentFunction COMPONENT_FUNCTIONS[] = {
 class Evaluator {
 public:
     MaybeValues evaluate(const TypedExpr* expression) {
-        if (++mSteps > MAX_STEPS)
+        if (mStepsLeft == 0)
             return std::nullopt;
+        --mStepsLeft;
         switch (expression->kind) {
         case Kind::LITERAL:
             return Values{valueAs(expression->number, expression->type->scalar)};
@@ -328,10 +329,11 @@ private:
     }
 
     static constexpr int MAX_DEPTH = 64;
-    static constexpr int MAX_STEPS =
-        200000; ///< constants that are made of constants can double at each level
+
+    /// Constants that are made of constants can double at each level.
+    static constexpr int MAX_STEPS = 200000;
     int mDepth = 0;
-    int mSteps = 0;
+    int mStepsLeft = MAX_STEPS;
 };
 
 } // namespace

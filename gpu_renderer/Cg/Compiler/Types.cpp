@@ -1,10 +1,14 @@
 #include <Cg/Compiler/Types.h>
 
 #include <algorithm>
+#include <cstdint>
 
 namespace cg {
 
 namespace {
+
+constexpr Scalar ALL_SCALARS[] = {Scalar::BOOL,  Scalar::INT,  Scalar::UINT,
+                                  Scalar::FIXED, Scalar::HALF, Scalar::FLOAT};
 
 struct NamedScalar {
     Name name;
@@ -96,26 +100,28 @@ TypeTable::TypeTable(Arena& arena) : mArena(arena) {
     };
     mVoid = make(Type::Kind::VOID);
     mText = make(Type::Kind::TEXT);
-    for (std::size_t s = 0; s < SCALARS; ++s)
+    for (const Scalar scalar : ALL_SCALARS)
         for (int size = 1; size <= MAX_SIZE; ++size) {
             auto* type = make(size == 1 ? Type::Kind::SCALAR : Type::Kind::VECTOR);
-            type->scalar = static_cast<Scalar>(s);
+            type->scalar = scalar;
             type->columns = size;
-            mVectors[s][static_cast<std::size_t>(size - 1)] = type;
+            mVectors[static_cast<std::size_t>(scalar)][static_cast<std::size_t>(size - 1)] = type;
         }
-    for (std::size_t s = 0; s < SCALARS; ++s)
+    for (const Scalar scalar : ALL_SCALARS)
         for (int rows = 1; rows <= MAX_SIZE; ++rows)
             for (int columns = 1; columns <= MAX_SIZE; ++columns) {
                 auto* type = make(Type::Kind::MATRIX);
-                type->scalar = static_cast<Scalar>(s);
+                type->scalar = scalar;
                 type->rows = rows;
                 type->columns = columns;
-                mNumeric[s][static_cast<std::size_t>(rows - 1)][static_cast<std::size_t>(columns - 1)] = type;
+                mNumeric[static_cast<std::size_t>(scalar)][static_cast<std::size_t>(rows - 1)]
+                        [static_cast<std::size_t>(columns - 1)] = type;
             }
-    for (std::size_t i = 0; i < SAMPLERS; ++i) {
+    int sampler = 0;
+    for (const Type*& slot : mSamplers) {
         auto* type = make(Type::Kind::SAMPLER);
-        type->sampler = static_cast<Sampler>(i);
-        mSamplers[i] = type;
+        type->sampler = static_cast<Sampler>(sampler++);
+        slot = type;
     }
 }
 
@@ -275,15 +281,15 @@ bool isOpaque(const Type* type) {
 
 int countLeaves(const Type* type, int limit) {
     if (type->isArray()) {
-        const int each = countLeaves(type->element, limit);
-        return type->length > limit / std::max(each, 1) ? limit : each * std::max(type->length, 0);
+        const std::int64_t each = countLeaves(type->element, limit);
+        return static_cast<int>(std::min<std::int64_t>(limit, each * std::max(type->length, 0)));
     }
     if (!type->isStruct())
         return type->components();
-    int count = 0;
+    std::int64_t count = 0;
     for (const Field& field : type->structure->fields)
-        count = std::min(limit, count + countLeaves(field.type, limit));
-    return count;
+        count = std::min<std::int64_t>(limit, count + countLeaves(field.type, limit));
+    return static_cast<int>(count);
 }
 
 } // namespace cg
