@@ -51,9 +51,10 @@ Variable* Globals::variable(const VariableDecl* declaration) {
         const ContextChange outside(mResolution.context, {}); // as if no function were being resolved
         resolve(variable, declaration);
     }
-    if (!variable->type)
-        mVariables[declaration] = variable = nullptr;
-    return variable;
+    if (variable->type)
+        return variable;
+    mVariables[declaration] = nullptr;
+    return nullptr;
 }
 
 Variable* Globals::parameter(const VariableDecl* declaration, const Type* type) {
