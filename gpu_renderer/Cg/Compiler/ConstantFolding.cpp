@@ -116,6 +116,11 @@ constexpr ComponentFunction COMPONENT_FUNCTIONS[] = {
     {"mix($0, $1, $2)", [](double x, double y, double t) { return x * (1 - t) + y * t; }},
 };
 
+/// A component of one operand among several: a scalar stands beside each.
+double component(const Values& values, std::size_t i) {
+    return values.size() == 1 ? values.front() : values[i];
+}
+
 class Evaluator {
 public:
     MaybeValues evaluate(const TypedExpr* expression) {
@@ -165,8 +170,7 @@ private:
             return std::nullopt;
         Values values;
         for (int i = 0; i < expression->type->columns; ++i) {
-            const std::size_t component = expression->components[static_cast<std::size_t>(i)];
-            values.push_back((*object)[component]);
+            values.push_back((*object)[expression->components[static_cast<std::size_t>(i)]]);
         }
         return values;
     }
@@ -174,11 +178,11 @@ private:
     MaybeValues element(const TypedExpr* expression) {
         const MaybeValues object = evaluate(expression->operands[0]);
         const MaybeValues index = evaluate(expression->operands[1]);
-        if (!object || !index || (*index)[0] < 0)
+        if (!object || !index || index->front() < 0)
             return std::nullopt;
         const auto size =
             static_cast<std::size_t>(countLeaves(expression->type, std::numeric_limits<int>::max()));
-        const auto first = static_cast<std::size_t>((*index)[0]) * size;
+        const auto first = static_cast<std::size_t>(index->front()) * size;
         if (first + size > object->size())
             return std::nullopt;
         const auto begin = object->begin() + static_cast<std::ptrdiff_t>(first);
@@ -197,7 +201,7 @@ private:
                 value = -value;
                 break;
             case UnaryOp::NOT:
-                value = value == 0 ? 1 : 0;
+                value = value == 0;
                 break;
             case UnaryOp::COMPLEMENT:
                 value = static_cast<double>(~static_cast<std::int64_t>(value));
@@ -225,8 +229,8 @@ private:
         const std::size_t count = std::max(a->size(), b->size());
         Values values;
         for (std::size_t i = 0; i < count; ++i) {
-            const auto value = operation(expression->binary, a->size() == 1 ? (*a)[0] : (*a)[i],
-                                         b->size() == 1 ? (*b)[0] : (*b)[i], left->type->scalar);
+            const auto value =
+                operation(expression->binary, component(*a, i), component(*b, i), left->type->scalar);
             if (!value)
                 return std::nullopt;
             values.push_back(*value);
@@ -238,7 +242,7 @@ private:
         const MaybeValues condition = evaluate(expression->operands[0]);
         if (!condition)
             return std::nullopt;
-        return evaluate(expression->operands[(*condition)[0] != 0 ? 1 : 2]);
+        return evaluate(expression->operands[condition->front() != 0 ? 1 : 2]);
     }
 
     MaybeValues construct(const TypedExpr* expression) {
@@ -253,7 +257,7 @@ private:
         if (!type->isNumeric())
             return values;
         // One value is the zero of a whole matrix; values too many are dropped.
-        values.resize(static_cast<std::size_t>(type->components()), values[0]);
+        values.resize(static_cast<std::size_t>(type->components()), values.front());
         return rounded(values, type);
     }
 
@@ -264,7 +268,7 @@ private:
         if (!values || !to->isNumeric())
             return values;
         if (from->isScalar())
-            values->resize(static_cast<std::size_t>(to->components()), (*values)[0]);
+            values->resize(static_cast<std::size_t>(to->components()), values->front());
         if (from->isFullMatrix() && to->isFullMatrix()) {
             Values cut;
             for (int row = 0; row < to->rows; ++row)
@@ -294,13 +298,11 @@ private:
             if (function.form != expression->form)
                 continue;
             Values values;
-            const auto component = [&](std::size_t operand, std::size_t i) {
-                if (operand >= operands.size())
-                    return 0.0;
-                return operands[operand].size() == 1 ? operands[operand][0] : operands[operand][i];
+            const auto argument = [&operands](std::size_t operand, std::size_t i) {
+                return operand < operands.size() ? component(operands[operand], i) : 0;
             };
             for (std::size_t i = 0; i < count; ++i)
-                values.push_back(function.compute(component(0, i), component(1, i), component(2, i)));
+                values.push_back(function.compute(argument(0, i), argument(1, i), argument(2, i)));
             return rounded(values, expression->type);
         }
         return std::nullopt;
