@@ -9,6 +9,7 @@
 #include <filesystem>
 #include <sstream>
 #include <string>
+#include <string_view>
 #include <vector>
 
 // Programs are data: every file under tests/cg/ names its entries in lines `//! vertex NAME` and
@@ -284,6 +285,45 @@ TEST(CgGlobals, AreConstantsWhereGlslTakesTheirValuesAsSuch) {
 }
 
 /// Each constant is made of the one before.
+/// @param number  what stands for `#`; `@` is the one before
+std::string numbered(const std::string& pattern, int number) {
+    std::string text;
+    for (const char c : pattern)
+        text += c == '#' ? std::to_string(number) : c == '@' ? std::to_string(number - 1) : std::string(1, c);
+    return text;
+}
+
+TEST(CgDeclarations, ThatLeadToOthersAreBounded) {
+    struct Chain {
+        const char* first;
+        const char* next;
+        const char* use;
+    };
+    const Chain chains[] = {{"float c0;", "static const float c# = c@ + 1;", "return c#;"},
+                            {"struct c0 { float a; };", "struct c# { c@ s; };", "c# v; return 1;"},
+                            {"typedef float c0;", "typedef c@ c#;", "c# v = 1; return v;"}};
+    for (const Chain& chain : chains)
+        for (const int length : {200, 30000}) {
+            std::string source = chain.first;
+            for (int i = 1; i <= length; ++i)
+                source += numbered(chain.next, i) + '\n';
+            source += "float4 main() : COLOR { " + numbered(chain.use, length) + " }";
+            const cg::CompileResult result = compileFragment(source);
+            const bool isRefused = result.listing.find(" is nested too deep") != std::string::npos;
+            EXPECT_EQ(isRefused, length > 500) << chain.next << '\n' << result.listing.substr(0, 500);
+            EXPECT_EQ(result.ok, !isRefused);
+        }
+}
+
+TEST(CgParameters, OfTheEntryThatAreStaticSamplersAreUniforms) {
+    EXPECT_EQ(parametersOf("uniform sampler2D t;\n"
+                           "float4 main(static sampler2D s = t, float2 uv : TEXCOORD0) : COLOR {\n"
+                           "    return tex2D(s, uv);\n"
+                           "}\n")
+                  .size(),
+              4U);
+}
+
 TEST(CgParameters, EndWithChainsOfTooManyConstants) {
     const auto chain = [](int length) {
         std::string program = "static const float a0 = 3;\n";

@@ -229,25 +229,22 @@ std::string GlslExpressions::arguments(const TypedExpr* expression) {
     return text;
 }
 
-/// @param type  that of the helper's first operand
-void GlslExpressions::addHelper(Name helper, const Type* type) {
-    for (bool isFirst = true; !helper.empty(); isFirst = false) {
-        const HelperFunction function = findHelper(helper, isFirst ? mSymbols.typeName(type) : "float");
-        if (!mKnownHelpers.insert(function.text).second)
-            break;
-        mHelpers.push_back(function.text);
-        // What it calls comes before it.
-        if (!isFirst)
-            std::rotate(mHelpers.rbegin(), mHelpers.rbegin() + 1, mHelpers.rbegin() + 2);
-        helper = function.needs;
-    }
+/// What it calls comes before it.
+/// @param typeName  that of the helper's first operand
+void GlslExpressions::addHelper(Name helper, const std::string& typeName) {
+    const HelperFunction function = findHelper(helper, typeName);
+    if (!mKnownHelpers.insert(function.text).second)
+        return;
+    if (!function.needs.empty())
+        addHelper(function.needs, "float");
+    mHelpers.push_back(function.text);
 }
 
 std::string GlslExpressions::builtin(const TypedExpr* expression) {
     if (expression->isByRows)
         return byRows(expression);
     if (!expression->helper.empty())
-        addHelper(expression->helper, expression->operands[0]->type);
+        addHelper(expression->helper, mSymbols.typeName(expression->operands[0]->type));
     return filledIn(expression->form,
                     [&](std::size_t operand) { return value(expression->operands[operand]); });
 }
@@ -262,8 +259,8 @@ std::string GlslExpressions::byRows(const TypedExpr* expression) {
                       mSymbols.declare(operands[i]->type, rowParameter(i));
     if (!expression->helper.empty()) {
         const Type* first = operands[0]->type;
-        addHelper(expression->helper,
-                  first->isMatrix() ? mTypes.vector(first->scalar, first->columns) : first);
+        const Type* row = first->isMatrix() ? mTypes.vector(first->scalar, first->columns) : first;
+        addHelper(expression->helper, mSymbols.typeName(row));
     }
     const std::string& result = mSymbols.typeName(expression->type);
     const std::string rest = "(" + parameters + ") {\n" + rowsBody(expression) + "}";

@@ -45,7 +45,7 @@ private:
     std::string builtin(const TypedExpr* expression);
     std::string byRows(const TypedExpr* expression);
     std::string rowsBody(const TypedExpr* expression);
-    void addHelper(Name helper, const Type* type);
+    void addHelper(Name helper, const std::string& typeName);
 
     const TypeTable& mTypes;
     GlslSymbols& mSymbols;

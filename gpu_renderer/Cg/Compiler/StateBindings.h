@@ -18,9 +18,8 @@ struct StateBinding {
 ///              "matrix.transpose.modelview[0]", "matrix.mvp.row[2]"
 StateBinding findState(const std::string& path, const TypeTable& types);
 
-/// @return the path in a semantic that names a piece of state, `STATE.MATRIX.MVP` or `glstate.fog.color`, in
-/// any
-///         case of letters; nothing for other semantics
+/// @return the path in a semantic that names a piece of state, `STATE.MATRIX.MVP` or
+///         `glstate.fog.color`, in any case of letters; nothing for other semantics
 std::optional<std::string> stateSemantic(Name semantic);
 
 } // namespace cg

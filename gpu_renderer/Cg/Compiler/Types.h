@@ -81,7 +81,6 @@ struct StructType {
     Name name; ///< empty for a nameless one
     const StructDecl* declaration;
     std::vector<Field> fields;
-    const StructType* base = nullptr;      ///< its fields come first in `fields`
     const StructDecl* interface = nullptr; ///< what it implements
     bool hasSamplers = false;              ///< at any depth
 

@@ -44,12 +44,15 @@ Variable* Globals::variable(const VariableDecl* declaration) {
                                           inQuotes(declaration->name) + " depends on itself");
         return known && known->type ? known : nullptr;
     }
+    const DeclarationLevel level(mResolution);
+    if (!level.fits(declaration->location, declaration->name))
+        return nullptr;
     Variable* variable =
         mResolution.makeVariable(Variable::Storage::GLOBAL, declaration->name, nullptr, declaration);
     mVariables[declaration] = variable;
     {
         const ContextChange outside(mResolution.context, {}); // as if no function were being resolved
-        resolve(variable, declaration);
+        resolve(variable);
     }
     if (variable->type)
         return variable;
@@ -60,15 +63,13 @@ Variable* Globals::variable(const VariableDecl* declaration) {
 Variable* Globals::parameter(const VariableDecl* declaration, const Type* type) {
     Variable* variable =
         mResolution.makeVariable(Variable::Storage::UNIFORM, declaration->name, nullptr, declaration);
-    resolve(variable, declaration);
-    if (variable->type && variable->storage != Variable::Storage::UNIFORM) {
-        variable->storage = Variable::Storage::UNIFORM; // without the word, or with a const
-        variable->isConst = false;
-        mResolution.program.globals.pop_back();
-        mResolution.program.uniforms.push_back(variable);
-    }
-    if (!variable->type)
+    if (!initialize(variable)) {
         variable->type = type;
+        return variable;
+    }
+    if (isUniform(variable)) // one with a const and a value is no piece of OpenGL's state
+        bindState(variable);
+    mResolution.program.uniforms.push_back(variable);
     return variable;
 }
 
@@ -77,30 +78,40 @@ bool Globals::has(const Variable* variable) const {
                        [variable](const auto& global) { return global.second == variable; });
 }
 
-/// Gives a global its type and its initial value. Leaves the type null after an error.
-void Globals::resolve(Variable* variable, const VariableDecl* declaration) {
+/// Decides what a global is. Leaves the type null after an error.
+void Globals::resolve(Variable* variable) {
+    if (!initialize(variable))
+        return;
+    const VariableDecl* declaration = variable->declaration;
+    if (declaration->qualifiers.isStatic && declaration->initializer && isOpaque(variable->type))
+        nameAnother(variable);
+    else
+        decide(variable);
+}
+
+/// Gives a variable its type and its initial value.
+/// @return false after an error: it has no type
+bool Globals::initialize(Variable* variable) {
+    const VariableDecl* declaration = variable->declaration;
     const Qualifiers& qualifiers = declaration->qualifiers;
     const Type* type = mTypes.typeOf(declaration->type, declaration->dimensions);
     if (!type)
-        return;
+        return false;
     TypedExpr* value = nullptr;
     if (declaration->initializer && !containsSampler(type)) {
         value = mInitializers.value(type, declaration->initializer);
         if (!value)
-            return;
+            return false;
     }
     if (type->isVoid() || (type->isUnsizedArray() && (qualifiers.isStatic || qualifiers.isConst))) {
         mResolution.diagnostics.error(declaration->location,
                                       inQuotes(declaration->name) + " cannot be '" + nameOf(type) + "'");
-        return;
+        return false;
     }
     variable->type = type;
     variable->isUnsized = type->isUnsizedArray();
     variable->initializer = value;
-    if (qualifiers.isStatic && declaration->initializer && isOpaque(type))
-        nameAnother(variable);
-    else
-        decide(variable);
+    return true;
 }
 
 /// A static sampler is a name for another one.
@@ -111,8 +122,7 @@ void Globals::nameAnother(Variable* sampler) {
         sampler->type = nullptr;
 }
 
-/// Decides what a global is: a uniform with or without a default value, a constant, or a variable of the
-/// program.
+/// A uniform with or without a default value, a constant, or a variable of the program.
 void Globals::decide(Variable* variable) {
     if (isUniform(variable)) {
         variable->storage = Variable::Storage::UNIFORM;

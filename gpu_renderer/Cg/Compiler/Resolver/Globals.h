@@ -32,7 +32,8 @@ public:
     bool has(const Variable* variable) const;
 
 private:
-    void resolve(Variable* variable, const VariableDecl* declaration);
+    void resolve(Variable* variable);
+    bool initialize(Variable* variable);
     void decide(Variable* variable);
     void nameAnother(Variable* sampler);
     void bindState(Variable* variable);

@@ -77,18 +77,18 @@ TypedStmt* LoopSamplers::withSelectors(SourceLocation at, Changes changes,
         if (standsForSampler(variable))
             changes.given.push_back(mAliases.use(at, variable));
     TypedStmt* sequence = mResolution.makeStatement(TypedStmt::Kind::SEQUENCE);
+    bool areAllAdded = true;
     for (Variable* variable : changes.variables) {
-        TypedStmt* start = addSelector(at, variable, changes.given);
-        if (!start)
-            return nullptr;
+        TypedStmt* start = areAllAdded ? addSelector(at, variable, changes.given) : nullptr;
+        areAllAdded = start != nullptr;
         sequence->body.push_back(start);
     }
-    TypedStmt* result = statement();
+    TypedStmt* result = areAllAdded ? statement() : nullptr;
     for (const Variable* variable : changes.variables)
         mAssignments.endSelection(variable);
     if (result)
         sequence->body.push_back(result);
-    return sequence;
+    return areAllAdded ? sequence : nullptr;
 }
 
 /// Lets a number say what the variable stands for.

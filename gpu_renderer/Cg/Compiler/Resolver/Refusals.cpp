@@ -39,6 +39,8 @@ std::string suggestion(Name name, const std::vector<Name>& known) {
     Name best;
     std::size_t bestDistance = limit + 1;
     for (const Name candidate : known) {
+        if (candidate == name)
+            continue; // known, but with an error of its own
         const std::size_t distance = editDistance(name, candidate, limit);
         if (distance < bestDistance || (distance == bestDistance && distance <= limit && candidate < best)) {
             bestDistance = distance;

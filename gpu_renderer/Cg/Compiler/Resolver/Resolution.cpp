@@ -1,5 +1,7 @@
 #include <Cg/Compiler/Resolver/Resolution.h>
 
+#include <Cg/Compiler/Diagnostics.h>
+
 #include <utility>
 
 namespace cg {
@@ -66,6 +68,13 @@ TypedExpr* Resolution::nothing(SourceLocation at) {
 CallChange::CallChange(Resolution& resolution, FunctionContext inner)
     : mContext(resolution.context, std::move(inner)), mDepth(resolution.callDepth) {
     ++mDepth;
+}
+
+bool DeclarationLevel::fits(SourceLocation at, Name name) const {
+    if (mResolution.declarationDepth <= MAX_DECLARATION_DEPTH)
+        return true;
+    mResolution.diagnostics.error(at, inQuotes(name) + " is nested too deep");
+    return false;
 }
 
 } // namespace cg

@@ -14,6 +14,8 @@ class Diagnostics;
 /// where in the source they are.
 struct Resolution {
     Resolution(Stage theStage, Arena& theArena, TypeTable& theTypes, Diagnostics& theDiagnostics);
+    Resolution(const Resolution&) = delete;
+    Resolution& operator=(const Resolution&) = delete;
 
     Variable* makeVariable(Variable::Storage storage, Name name, const Type* type,
                            const VariableDecl* declaration);
@@ -49,7 +51,8 @@ struct Resolution {
     TypedBuilder build;
     TypedProgram& program;
     FunctionContext context;
-    int callDepth = 0; ///< calls within calls within calls
+    int callDepth = 0;        ///< calls within calls within calls
+    int declarationDepth = 0; ///< globals and types that are resolved for others
 };
 
 /// Calls within calls within calls: more is no program but an attack.
@@ -66,6 +69,26 @@ public:
 private:
     ContextChange mContext;
     int& mDepth;
+};
+
+/// Globals and types that name others, which name others: more is no program but an attack.
+constexpr int MAX_DECLARATION_DEPTH = 500;
+
+/// One global or type that is being resolved, for as long as it lives.
+class DeclarationLevel {
+public:
+    explicit DeclarationLevel(Resolution& resolution) : mResolution(resolution) {
+        ++mResolution.declarationDepth;
+    }
+    ~DeclarationLevel() { --mResolution.declarationDepth; }
+    DeclarationLevel(const DeclarationLevel&) = delete;
+    DeclarationLevel& operator=(const DeclarationLevel&) = delete;
+
+    /// @return false where it is nested too deep, which is an error
+    bool fits(SourceLocation at, Name name) const;
+
+private:
+    Resolution& mResolution;
 };
 
 } // namespace cg

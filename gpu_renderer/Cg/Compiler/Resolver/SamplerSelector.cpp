@@ -1,6 +1,5 @@
 #include <Cg/Compiler/Resolver/SamplerSelector.h>
 
-#include <Cg/Compiler/ConstantFolding.h>
 #include <Cg/Compiler/Diagnostics.h>
 #include <Cg/Compiler/Resolver/Resolution.h>
 #include <Cg/Compiler/Resolver/SamplerPaths.h>

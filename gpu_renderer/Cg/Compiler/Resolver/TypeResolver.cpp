@@ -25,6 +25,9 @@ const Type* TypeResolver::aliasType(const TypedefDecl* alias) {
     const auto [slot, isNew] = mAliasTypes.emplace(alias, nullptr);
     if (!isNew)
         return slot->second;
+    const DeclarationLevel level(mResolution);
+    if (!level.fits(alias->location, alias->name))
+        return nullptr;
     // The null in the table ends a typedef of itself.
     const Type* type = typeOf(alias->type, alias->dimensions);
     mAliasTypes[alias] = type;
@@ -42,6 +45,8 @@ const Type* TypeResolver::typeOf(const TypeSyntax* syntax) {
     } else {
         type = find(syntax->name);
     }
+    if (!type && (syntax->definition || mDeclarations.findStruct(syntax->name)))
+        return nullptr; // its own error has been said
     if (!type) {
         std::vector<Name> known = builtinTypeNames();
         const std::vector<Name> declared = mDeclarations.typeNames();
@@ -105,6 +110,9 @@ const Type* TypeResolver::structType(const StructDecl* declaration) {
                                           "struct " + inQuotes(declaration->name) + " contains itself");
         return found->second;
     }
+    const DeclarationLevel level(mResolution);
+    if (!level.fits(declaration->location, declaration->name))
+        return nullptr;
     mStructTypes[declaration] = nullptr;
     const Type* type = mResolution.types.makeStruct(declaration);
     setBase(type->structure);
