@@ -33,6 +33,13 @@ private:
     TemporaryFile mFile{"program.cg"};
 };
 
+TEST(ToolShaderFiles, TheProgramsOfTheHostAreFoundByName) {
+    const ToolRun run = runTool("shader key_over_checkerboard.cg --entry Cg_Main --stage fragment");
+    EXPECT_EQ(run.exitCode, 0) << run.remarks;
+    EXPECT_NE(run.output.find("cell"), std::string::npos) << run.output;
+    EXPECT_EQ(runTool("shader nowhere.cg --entry Cg_Main --stage fragment").exitCode, 1);
+}
+
 TEST_F(ToolShader, ListsWhatAHostSets) {
     const ToolRun run = compile(PROGRAM, "-D GAMMA=2.2");
     ASSERT_EQ(run.exitCode, 0) << run.remarks;

@@ -1,5 +1,6 @@
 #include "Verbs.h"
 
+#include <CgFolder.h>
 #include <OutputFile.h>
 
 #include <Cg/Compiler/Compiler.h>
@@ -41,10 +42,11 @@ bool readFile(const std::string& path, std::string& text) {
 
 cg::CompileRequest requestOf(const ShaderOptions& options) {
     cg::CompileRequest request;
+    const std::string file = host::findCgProgram(options.file);
     errno = 0;
-    if (!readFile(options.file, request.source))
-        throw std::runtime_error(options.file + ": it cannot be read: " + std::strerror(errno));
-    request.fileName = options.file;
+    if (!readFile(file, request.source))
+        throw std::runtime_error(file + ": it cannot be read: " + std::strerror(errno));
+    request.fileName = file;
     request.entry = options.entry;
     request.stage = options.stage;
     request.reader = readFile;
