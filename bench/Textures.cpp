@@ -15,6 +15,7 @@
 #include <cstdlib>
 #include <cstring>
 #include <memory>
+#include <stdexcept>
 #include <string>
 #include <vector>
 
@@ -153,6 +154,8 @@ public:
         for (GLuint name = ABOVE_ALL_NAMES; mOnDevice == 0 && --name > 0;) // the last made beside the PBO
             if (glIsBuffer(name) == GL_TRUE && name != getPboID(0))
                 mOnDevice = name;
+        if (mOnDevice == 0)
+            throw std::runtime_error("the buffer on the device has not been found");
         readbackGLTexToPBO(0); // memory that nobody has written yet may all be one page of zeros
     }
     GLuint onDevice() const { return mOnDevice; }

@@ -6,6 +6,7 @@
 
 #include <FwZel/PictureSize.h>
 
+#include <cstddef>
 #include <cstdint>
 #include <string>
 
@@ -17,6 +18,8 @@ struct FuzzedReader {
     void (*fill)(std::string fileName, Texture* texture, uint32_t buffer, uint32_t field, uint32_t shift,
                  bool isFp16);
     std::string (*refusal)(const std::string& fileName);
+
+    bool tellsEmptySizes; ///< reports a size of 0 as success
 
     /// A texture for a file of this size.
     Texture::TexArgs (*argsOf)(uint8_t choice, uint32_t fileWidth, uint32_t fileHeight);
@@ -35,6 +38,7 @@ struct FuzzedReader {
         uint32_t bytesPerColour = 0;
         const bool hasSize = readSize(file.path(), &width, &height, &bytesPerColour) == 0;
         const bool isAccepted = hasSize && width > 0 && height > 0 && pictureFits(width, height, COMPONENTS);
+        require(!hasSize || tellsEmptySizes || (width > 0 && height > 0));
         require(!hasSize || bytesPerColour == 1 || bytesPerColour == 2);
 
         const uint8_t choice = size > 0 ? data[size - 1] : 0;

@@ -4,6 +4,8 @@
 
 #include <FwZel/PngFile.h>
 
+#include <algorithm>
+
 namespace {
 
 Texture::TexArgs argsOf(uint8_t choice, uint32_t /*fileWidth*/, uint32_t /*fileHeight*/) {
@@ -21,8 +23,8 @@ size_t rowBytes(const Texture& texture, uint32_t fileWidth) {
     return std::min<size_t>(components * texture.getBytesPerColour(), texture.getPitch());
 }
 
-constexpr FuzzedReader READER = {getWidthHeightFromPngFile, fillTextureFromPngFile, refusalOfPngFile, argsOf,
-                                 rowBytes};
+constexpr FuzzedReader READER = {
+    getWidthHeightFromPngFile, fillTextureFromPngFile, refusalOfPngFile, false, argsOf, rowBytes};
 
 } // namespace
 

@@ -21,8 +21,8 @@ size_t rowBytes(const Texture& texture, uint32_t fileWidth) {
     return fileWidth == texture.getWidth() ? size_t{fileWidth} * texture.getBytesPerPixel() : 0;
 }
 
-constexpr FuzzedReader READER = {getWidthHeightFromPpmFile, fillTextureFromPpmFile, refusalOfPpmFile, argsOf,
-                                 rowBytes};
+constexpr FuzzedReader READER = {
+    getWidthHeightFromPpmFile, fillTextureFromPpmFile, refusalOfPpmFile, true, argsOf, rowBytes};
 
 } // namespace
 
