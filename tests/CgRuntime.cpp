@@ -104,6 +104,15 @@ protected:
     }
 };
 
+TEST(CgErrors, EachHasATextOfItsOwn) {
+    std::set<std::string> texts;
+    for (int error = CG_NO_ERROR; error <= CG_OUT_OF_ARRAY_BOUNDS_ERROR; ++error)
+        texts.insert(cgGetErrorString(static_cast<CGerror>(error)));
+    EXPECT_EQ(texts.size(), size_t{CG_OUT_OF_ARRAY_BOUNDS_ERROR} + 1);
+    EXPECT_EQ(texts.count("unknown error"), 0U);
+    EXPECT_STREQ(cgGetErrorString(static_cast<CGerror>(CG_OUT_OF_ARRAY_BOUNDS_ERROR + 1)), "unknown error");
+}
+
 TEST_F(CgRuntime, ReadingTheErrorClearsItAndNothingElseDoes) {
     cgGLEnableProfile(CG_PROFILE_ARBVP1);
     cgDestroyProgram(nullptr);

@@ -38,8 +38,8 @@ std::string missingWith(const char* version, const std::string& without) {
         } catch (const std::runtime_error& error) {
             missing = NO_CONTEXT + error.what();
         }
-        _exit(write(output, missing.data(), missing.size()) < 0 ? 1
-                                                                : 0); // without what the driver does at exit
+        const bool isTold = write(output, missing.data(), missing.size()) >= 0;
+        _exit(isTold ? 0 : 1); // without what the driver does at exit
     });
     return child.status == 0 ? child.text : "died with status " + std::to_string(child.status);
 }

@@ -23,12 +23,11 @@ struct ProgramParameter {
     ProgramParameter* next = nullptr; ///< the following one of the name space, or of the structure
     CGparameter handle = nullptr;     ///< null until the host asks for it
 
-    int location = -1; ///< of the uniform; -1 where OpenGL has none
-    const UniformType* type =
-        nullptr;              ///< of the uniform, of an array its elements'; null where OpenGL has none
-    int textureUnit = -1;     ///< of a sampler that the program uses, else -1
-    unsigned int texture = 0; ///< of a sampler: OpenGL name
-    bool hasTexture = false;  ///< the host has given the sampler a texture
+    int location = -1;                 ///< of the uniform; -1 where OpenGL has none
+    const UniformType* type = nullptr; ///< of the uniform, of an array its elements'; null likewise
+    int textureUnit = -1;              ///< of a sampler that the program uses, else -1
+    unsigned int texture = 0;          ///< of a sampler: OpenGL name
+    bool hasTexture = false;           ///< the host has given the sampler a texture
 };
 
 /// Sets each one's next to its follower of the same name space.
