@@ -1,6 +1,6 @@
 #include <Cg/Compiler/Resolver/Assignments.h>
 
-#include <Cg/Compiler/Resolver/Parts.h>
+#include <Cg/Compiler/Resolver/MemberAccess.h>
 #include <Cg/Compiler/Resolver/Places.h>
 #include <Cg/Compiler/Resolver/Recursion.h>
 #include <Cg/Compiler/Resolver/Resolution.h>
@@ -74,7 +74,7 @@ TypedExpr* Assignments::assignElements(const AssignExpr* expr, const MemberExpr*
     TypedBuilder& build = mResolution.build;
     const SourceLocation at = expr->location;
     TypedExpr* value = mRecursion.expression(expr->value);
-    TypedExpr* elements = mParts.elementsOf(target->location, matrix, target->name);
+    TypedExpr* elements = mMembers.elementsOf(target->location, matrix, target->name);
     if (!value || !elements || !mPlaces.checkAssignable(at, matrix))
         return nullptr;
     if (expr->isCompound)

@@ -6,7 +6,7 @@
 
 namespace cg {
 
-class Parts;
+class MemberAccess;
 class Places;
 class Recursion;
 class SamplerAssignments;
@@ -15,9 +15,9 @@ struct Resolution;
 /// `target = value` and `target += value`
 class Assignments {
 public:
-    Assignments(Resolution& resolution, Recursion& recursion, Parts& parts, Places& places,
+    Assignments(Resolution& resolution, Recursion& recursion, MemberAccess& members, Places& places,
                 SamplerAssignments& samplers)
-        : mResolution(resolution), mRecursion(recursion), mParts(parts), mPlaces(places),
+        : mResolution(resolution), mRecursion(recursion), mMembers(members), mPlaces(places),
           mSamplers(samplers) {}
 
     /// @return null after an error
@@ -30,7 +30,7 @@ private:
 
     Resolution& mResolution;
     Recursion& mRecursion;
-    Parts& mParts;
+    MemberAccess& mMembers;
     Places& mPlaces;
     SamplerAssignments& mSamplers;
 };

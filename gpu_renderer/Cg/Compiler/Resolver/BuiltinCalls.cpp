@@ -1,5 +1,6 @@
 #include <Cg/Compiler/Resolver/BuiltinCalls.h>
 
+#include <Cg/Compiler/BuiltinFunctions.h>
 #include <Cg/Compiler/Diagnostics.h>
 #include <Cg/Compiler/Resolver/ChosenCalls.h>
 #include <Cg/Compiler/Resolver/PassedArguments.h>

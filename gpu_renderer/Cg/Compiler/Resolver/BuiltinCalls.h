@@ -1,7 +1,6 @@
 #ifndef CG_COMPILER_RESOLVER_BUILTIN_CALLS_H
 #define CG_COMPILER_RESOLVER_BUILTIN_CALLS_H
 
-#include <Cg/Compiler/BuiltinFunctions.h>
 #include <Cg/Compiler/Resolver/BuiltinChoice.h>
 #include <Cg/Compiler/Resolver/BuiltinForms.h>
 #include <Cg/Compiler/SourceLocation.h>
@@ -13,6 +12,7 @@
 namespace cg {
 
 class ChosenCalls;
+class PassedArguments;
 class Places;
 class SamplerKinds;
 struct Resolution;

@@ -4,8 +4,8 @@
 #include <Cg/Compiler/Resolver/Assignments.h>
 #include <Cg/Compiler/Resolver/Calls.h>
 #include <Cg/Compiler/Resolver/Initializers.h>
-#include <Cg/Compiler/Resolver/Names.h>
-#include <Cg/Compiler/Resolver/Parts.h>
+#include <Cg/Compiler/Resolver/MemberAccess.h>
+#include <Cg/Compiler/Resolver/NameResolver.h>
 #include <Cg/Compiler/Resolver/Places.h>
 #include <Cg/Compiler/Resolver/Resolution.h>
 #include <Cg/Compiler/Resolver/SamplerLists.h>
@@ -16,9 +16,10 @@
 namespace cg {
 
 ExpressionResolver::ExpressionResolver(Resolution& resolution, TypeResolver& types,
-                                       Initializers& initializers, Names& names, Parts& parts, Places& places,
-                                       SamplerLists& lists, Calls& calls, Assignments& assignments)
-    : mResolution(resolution), mTypes(types), mInitializers(initializers), mNames(names), mParts(parts),
+                                       Initializers& initializers, NameResolver& names, MemberAccess& members,
+                                       Places& places, SamplerLists& lists, Calls& calls,
+                                       Assignments& assignments)
+    : mResolution(resolution), mTypes(types), mInitializers(initializers), mNames(names), mMembers(members),
       mPlaces(places), mLists(lists), mCalls(calls), mAssignments(assignments) {}
 
 TypedExpr* ExpressionResolver::expression(const Expr* expr) {
@@ -84,7 +85,7 @@ TypedExpr* ExpressionResolver::member(const MemberExpr* expr) {
     if (TypedExpr* state = mNames.state(expr))
         return state;
     TypedExpr* object = expression(expr->object);
-    return object ? mParts.member(expr->location, object, expr->name) : nullptr;
+    return object ? mMembers.member(expr->location, object, expr->name) : nullptr;
 }
 
 TypedExpr* ExpressionResolver::index(const IndexExpr* expr) {
@@ -94,7 +95,7 @@ TypedExpr* ExpressionResolver::index(const IndexExpr* expr) {
                             ? mNames.name(static_cast<const NameExpr*>(expr->object), true)
                             : expression(expr->object);
     TypedExpr* position = expression(expr->index);
-    return object && position ? mParts.element(expr->location, object, position) : nullptr;
+    return object && position ? mMembers.element(expr->location, object, position) : nullptr;
 }
 
 TypedExpr* ExpressionResolver::constructor(const ConstructExpr* expr) {

@@ -10,8 +10,8 @@ namespace cg {
 class Assignments;
 class Calls;
 class Initializers;
-class Names;
-class Parts;
+class NameResolver;
+class MemberAccess;
 class Places;
 class SamplerLists;
 class TypeResolver;
@@ -22,9 +22,9 @@ struct Resolution;
 /// Operations return null after an error.
 class ExpressionResolver {
 public:
-    ExpressionResolver(Resolution& resolution, TypeResolver& types, Initializers& initializers, Names& names,
-                       Parts& parts, Places& places, SamplerLists& lists, Calls& calls,
-                       Assignments& assignments);
+    ExpressionResolver(Resolution& resolution, TypeResolver& types, Initializers& initializers,
+                       NameResolver& names, MemberAccess& members, Places& places, SamplerLists& lists,
+                       Calls& calls, Assignments& assignments);
 
     TypedExpr* expression(const Expr* expr);
 
@@ -42,8 +42,8 @@ private:
     Resolution& mResolution;
     TypeResolver& mTypes;
     Initializers& mInitializers;
-    Names& mNames;
-    Parts& mParts;
+    NameResolver& mNames;
+    MemberAccess& mMembers;
     Places& mPlaces;
     SamplerLists& mLists;
     Calls& mCalls;

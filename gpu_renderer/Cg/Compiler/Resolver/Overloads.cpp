@@ -16,7 +16,7 @@ namespace {
 using Kind = TypedExpr::Kind;
 
 /// A function could write to it.
-bool isPlace(const TypedExpr* argument) {
+bool mayBeOut(const TypedExpr* argument) {
     return rootVariable(argument) || argument->kind == Kind::CONSTRUCT;
 }
 
@@ -93,7 +93,7 @@ int Overloads::argumentCost(const FunctionDecl* function, std::size_t position, 
     const int there = direction == Direction::OUT ? 0 : conversionCost(argument, type);
     if (there == IMPOSSIBLE_CONVERSION || direction == Direction::IN)
         return there;
-    if (!isPlace(argument))
+    if (!mayBeOut(argument))
         return IMPOSSIBLE_CONVERSION;
     const TypedExpr result(Kind::LITERAL, argument->location, type);
     const int back =
@@ -156,7 +156,7 @@ std::string Overloads::objection(const FunctionDecl* function, const Arguments& 
         if (argumentCost(function, i, arguments[i]) != IMPOSSIBLE_CONVERSION)
             continue;
         const std::string argument = "argument " + std::to_string(i + 1);
-        if (directionOf(function->parameters[i]) != Direction::IN && !isPlace(arguments[i]))
+        if (directionOf(function->parameters[i]) != Direction::IN && !mayBeOut(arguments[i]))
             return argument + " cannot be written to";
         return "no conversion of " + argument + " from '" + nameOf(arguments[i]->type) + "' to '" +
                nameOf(parameters[i]) + "'";

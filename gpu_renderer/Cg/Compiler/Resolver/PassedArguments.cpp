@@ -13,7 +13,7 @@ namespace {
 using Kind = TypedExpr::Kind;
 
 /// The two types are one type in GLSL.
-bool isSameInGlsl(const Type* a, const Type* b) {
+bool isOneTypeInGlsl(const Type* a, const Type* b) {
     if (a == b)
         return true;
     return a->isNumeric() && b->isNumeric() && a->kind == b->kind && a->rows == b->rows &&
@@ -33,7 +33,7 @@ bool isRow(const TypedExpr* argument, const Type* type) {
 /// GLSL writes to the argument itself.
 bool takesResult(const TypedExpr* argument, const Type* type) {
     return !isElements(argument) && !isRow(argument, type) && argument->kind != Kind::CONVERT &&
-           (isSameInGlsl(argument->type, type) || !type->isNumeric());
+           (isOneTypeInGlsl(argument->type, type) || !type->isNumeric());
 }
 
 } // namespace

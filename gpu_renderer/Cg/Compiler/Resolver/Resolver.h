@@ -16,9 +16,9 @@
 #include <Cg/Compiler/Resolver/Instances.h>
 #include <Cg/Compiler/Resolver/LocalDeclarations.h>
 #include <Cg/Compiler/Resolver/LoopSamplers.h>
-#include <Cg/Compiler/Resolver/Names.h>
+#include <Cg/Compiler/Resolver/MemberAccess.h>
+#include <Cg/Compiler/Resolver/NameResolver.h>
 #include <Cg/Compiler/Resolver/Overloads.h>
-#include <Cg/Compiler/Resolver/Parts.h>
 #include <Cg/Compiler/Resolver/Places.h>
 #include <Cg/Compiler/Resolver/Recursion.h>
 #include <Cg/Compiler/Resolver/Resolution.h>
@@ -85,8 +85,8 @@ private:
     Calls mCalls;
 
     // Expressions
-    Parts mParts;
-    Names mNames;
+    MemberAccess mMembers;
+    NameResolver mNames;
     Assignments mAssignments;
     ExpressionResolver mExpressions;
 

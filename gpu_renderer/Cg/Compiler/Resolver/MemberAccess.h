@@ -1,5 +1,5 @@
-#ifndef CG_COMPILER_RESOLVER_PARTS_H
-#define CG_COMPILER_RESOLVER_PARTS_H
+#ifndef CG_COMPILER_RESOLVER_MEMBER_ACCESS_H
+#define CG_COMPILER_RESOLVER_MEMBER_ACCESS_H
 
 #include <Cg/Compiler/SourceLocation.h>
 #include <Cg/Compiler/TypedTree.h>
@@ -14,9 +14,9 @@ struct Resolution;
 /// Members, components and elements of values.
 ///
 /// Operations return null after an error.
-class Parts {
+class MemberAccess {
 public:
-    Parts(Resolution& resolution, TypeResolver& types, SamplerPieces& pieces, SamplerLists& lists)
+    MemberAccess(Resolution& resolution, TypeResolver& types, SamplerPieces& pieces, SamplerLists& lists)
         : mResolution(resolution), mTypes(types), mPieces(pieces), mLists(lists) {}
 
     /// `object.name`

@@ -1,5 +1,5 @@
-#ifndef CG_COMPILER_RESOLVER_NAMES_H
-#define CG_COMPILER_RESOLVER_NAMES_H
+#ifndef CG_COMPILER_RESOLVER_NAME_RESOLVER_H
+#define CG_COMPILER_RESOLVER_NAME_RESOLVER_H
 
 #include <Cg/Compiler/TypedTree.h>
 
@@ -7,17 +7,17 @@ namespace cg {
 
 class Declarations;
 class Globals;
-class Parts;
+class MemberAccess;
 class SamplerAliases;
 struct Resolution;
 
 /// What the names in expressions mean.
-class Names {
+class NameResolver {
 public:
-    Names(Resolution& resolution, const Declarations& declarations, Globals& globals, SamplerAliases& aliases,
-          Parts& parts)
+    NameResolver(Resolution& resolution, const Declarations& declarations, Globals& globals,
+                 SamplerAliases& aliases, MemberAccess& members)
         : mResolution(resolution), mDeclarations(declarations), mGlobals(globals), mAliases(aliases),
-          mParts(parts) {}
+          mMembers(members) {}
 
     /// @param isIndexed  brackets follow, so what has no size can be named
     /// @return null after an error
@@ -39,7 +39,7 @@ private:
     const Declarations& mDeclarations;
     Globals& mGlobals;
     SamplerAliases& mAliases;
-    Parts& mParts;
+    MemberAccess& mMembers;
 };
 
 } // namespace cg

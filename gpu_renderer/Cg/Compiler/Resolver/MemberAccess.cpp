@@ -1,4 +1,4 @@
-#include <Cg/Compiler/Resolver/Parts.h>
+#include <Cg/Compiler/Resolver/MemberAccess.h>
 
 #include <Cg/Compiler/ConstantFolding.h>
 #include <Cg/Compiler/Diagnostics.h>
@@ -27,7 +27,7 @@ int elementCount(const Type* type) {
 
 } // namespace
 
-TypedExpr* Parts::member(SourceLocation at, TypedExpr* object, Name name) {
+TypedExpr* MemberAccess::member(SourceLocation at, TypedExpr* object, Name name) {
     const Type* type = object->type;
     if (type->isStruct())
         return field(at, object, name);
@@ -41,7 +41,7 @@ TypedExpr* Parts::member(SourceLocation at, TypedExpr* object, Name name) {
     return nullptr;
 }
 
-TypedExpr* Parts::field(SourceLocation at, TypedExpr* object, Name name) {
+TypedExpr* MemberAccess::field(SourceLocation at, TypedExpr* object, Name name) {
     const StructType* structure = object->type->structure;
     const int index = structure->find(name);
     if (index < 0) {
@@ -57,7 +57,7 @@ TypedExpr* Parts::field(SourceLocation at, TypedExpr* object, Name name) {
                           : mResolution.build.field(at, object, index);
 }
 
-TypedExpr* Parts::swizzle(SourceLocation at, TypedExpr* object, Name name) {
+TypedExpr* MemberAccess::swizzle(SourceLocation at, TypedExpr* object, Name name) {
     const std::vector<int> components = swizzleComponents(name);
     const bool fits = std::all_of(components.begin(), components.end(),
                                   [&](int component) { return component < object->type->columns; });
@@ -68,7 +68,7 @@ TypedExpr* Parts::swizzle(SourceLocation at, TypedExpr* object, Name name) {
     return mResolution.build.swizzle(at, object, components);
 }
 
-TypedExpr* Parts::elementsOf(SourceLocation at, TypedExpr* matrix, Name name) {
+TypedExpr* MemberAccess::elementsOf(SourceLocation at, TypedExpr* matrix, Name name) {
     TypedBuilder& build = mResolution.build;
     const std::vector<MatrixElement> elements = matrixElements(name);
     std::vector<TypedExpr*> values;
@@ -90,7 +90,7 @@ TypedExpr* Parts::elementsOf(SourceLocation at, TypedExpr* matrix, Name name) {
     return mResolution.inOrder(at, preparation, build.make(Kind::CONSTRUCT, at, type, values));
 }
 
-TypedExpr* Parts::element(SourceLocation at, TypedExpr* object, TypedExpr* index) {
+TypedExpr* MemberAccess::element(SourceLocation at, TypedExpr* object, TypedExpr* index) {
     TypedBuilder& build = mResolution.build;
     const Type* type = object->type;
     if (!type->isArray() && !type->isNumeric()) {
@@ -120,7 +120,7 @@ TypedExpr* Parts::element(SourceLocation at, TypedExpr* object, TypedExpr* index
 }
 
 /// A uniform array without a size is as long as the use of its elements asks for.
-TypedExpr* Parts::elementOfUnsized(SourceLocation at, TypedExpr* array, TypedExpr* index) {
+TypedExpr* MemberAccess::elementOfUnsized(SourceLocation at, TypedExpr* array, TypedExpr* index) {
     Variable* variable = array->variable;
     const auto position = constantValue(index);
     if (!position || (*position)[0] < 0 || (*position)[0] >= TypeResolver::MAX_ARRAY_LENGTH) {

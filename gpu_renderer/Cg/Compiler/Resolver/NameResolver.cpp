@@ -1,9 +1,9 @@
-#include <Cg/Compiler/Resolver/Names.h>
+#include <Cg/Compiler/Resolver/NameResolver.h>
 
 #include <Cg/Compiler/Diagnostics.h>
 #include <Cg/Compiler/Resolver/Declarations.h>
 #include <Cg/Compiler/Resolver/Globals.h>
-#include <Cg/Compiler/Resolver/Parts.h>
+#include <Cg/Compiler/Resolver/MemberAccess.h>
 #include <Cg/Compiler/Resolver/Refusals.h>
 #include <Cg/Compiler/Resolver/Resolution.h>
 #include <Cg/Compiler/Resolver/SamplerAliases.h>
@@ -50,7 +50,7 @@ void moveDeclarationOut(Arena& arena, TypedStmt* loop) {
 
 } // namespace
 
-TypedExpr* Names::name(const NameExpr* expr, bool isIndexed) {
+TypedExpr* NameResolver::name(const NameExpr* expr, bool isIndexed) {
     if (Variable* variable = mResolution.context.findVariable(expr->name))
         return use(expr, variable, isIndexed);
     if (isOfSelf(expr->name))
@@ -68,7 +68,7 @@ TypedExpr* Names::name(const NameExpr* expr, bool isIndexed) {
 }
 
 /// Of a uniform array without a size only elements can be used: it is as long as they ask for.
-TypedExpr* Names::use(const NameExpr* expr, Variable* variable, bool isIndexed) {
+TypedExpr* NameResolver::use(const NameExpr* expr, Variable* variable, bool isIndexed) {
     const bool isLost = isOpaque(variable->type) && !standsForSampler(variable);
     if (!isLost && (!variable->isUnsized || isIndexed))
         return mAliases.use(expr->location, variable);
@@ -80,19 +80,19 @@ TypedExpr* Names::use(const NameExpr* expr, Variable* variable, bool isIndexed) 
 }
 
 /// It is a method's object or a member of that.
-bool Names::isOfSelf(Name name) const {
+bool NameResolver::isOfSelf(Name name) const {
     const Variable* self = mResolution.context.self;
     return self && (name == "this" || self->type->structure->find(name) >= 0);
 }
 
-TypedExpr* Names::ofSelf(const NameExpr* expr) {
+TypedExpr* NameResolver::ofSelf(const NameExpr* expr) {
     TypedExpr* self = mResolution.build.variable(expr->location, mResolution.context.self);
-    return expr->name == "this" ? self : mParts.member(expr->location, self, expr->name);
+    return expr->name == "this" ? self : mMembers.member(expr->location, self, expr->name);
 }
 
 /// The variable of a `for` that is used after its loop, as old C++ allowed.
 /// @return null where no loop of the blocks around had one of that name
-Variable* Names::pastLoopVariable(const NameExpr* expr) {
+Variable* NameResolver::pastLoopVariable(const NameExpr* expr) {
     const auto& loops = mResolution.context.pastLoops;
     const auto found = std::find_if(loops.rbegin(), loops.rend(),
                                     [expr](const auto& past) { return past.variable->name == expr->name; });
@@ -108,7 +108,7 @@ Variable* Names::pastLoopVariable(const NameExpr* expr) {
 
 /// The variable within its own initial value, `float sum = sum + 1;`: as in C it is in scope, but has no
 /// value. What else has the name comes first.
-Variable* Names::ownValue(const NameExpr* expr) {
+Variable* NameResolver::ownValue(const NameExpr* expr) {
     Variable* variable = mResolution.context.declared;
     if (!variable || !variable->type || variable->name != expr->name)
         return nullptr;
@@ -117,7 +117,7 @@ Variable* Names::ownValue(const NameExpr* expr) {
     return variable;
 }
 
-void Names::refuse(const NameExpr* expr) {
+void NameResolver::refuse(const NameExpr* expr) {
     std::vector<Name> known = mDeclarations.globalNames();
     for (const FunctionContext::ScopeEntry& entry : mResolution.context.scope)
         if (entry.variable)
@@ -126,7 +126,7 @@ void Names::refuse(const NameExpr* expr) {
                                   "undeclared name " + inQuotes(expr->name) + suggestion(expr->name, known));
 }
 
-TypedExpr* Names::state(const Expr* expr) {
+TypedExpr* NameResolver::state(const Expr* expr) {
     Name root;
     const std::string path = statePath(expr, root);
     const bool isState = root == "glstate" || root == "state";
