@@ -294,6 +294,7 @@ TEST_F(CgPreprocessor, EndsOnEveryText) {
     const std::vector<Case> cases{
         {"file that includes itself", "#include \"main.cg\"", ""},
         {"file that includes itself twice", "#include \"self.h\"\n#include \"self.h\"", ""},
+        {"large file included often", repeated("#include \"large.h\"\n", 4000), ""},
         {"macros that double", doubling + "A63", ""},
         {"spellings that double", gluing + repeated("H(", 60) + "a" + repeated(")", 60), ""},
         {"nested calls", "#define f(x) x\n" + repeated("f(", 50000) + repeated(")", 50000), ""},
@@ -302,10 +303,11 @@ TEST_F(CgPreprocessor, EndsOnEveryText) {
         {"nested parentheses", "#if " + repeated("(", 50000) + "\n", ""},
         {"questions", "#if " + repeated("1?", 50000) + "\n", ""},
     };
+    const Texts files{{"shaders/self.h", "#include \"self.h\"\n#include \"self.h\"\n"},
+                      {"shaders/large.h", "//" + repeated("x", 1 << 20)}};
     for (const Case& one : cases) {
         SCOPED_TRACE(one.name);
-        EXPECT_TRUE(
-            run(one.source, {{"shaders/self.h", "#include \"self.h\"\n#include \"self.h\"\n"}}).hasErrors);
+        EXPECT_TRUE(run(one.source, files).hasErrors);
     }
     EXPECT_FALSE(run("#if " + repeated("!", 100000) + "0\n#endif").hasErrors);
     EXPECT_FALSE(run("#define f(x) x f\nf" + repeated("(1)", 20000)).hasErrors);

@@ -3,6 +3,9 @@
 #include <fixture/SwappedEntryPoint.h>
 #include <fixture/TemporaryFile.h>
 
+#include <sys/stat.h>
+
+#include <filesystem>
 #include <functional>
 #include <random>
 #include <set>
@@ -216,6 +219,12 @@ TEST_F(CgRuntime, AnInvalidHandleSetsTheErrorAndDoesNothing) {
 TEST_F(CgRuntime, WhatDoesNotCompileIsNullWithAListing) {
     const TemporaryFile broken("broken.cg", bytesOf("float4 main() : COLOR\n{\n    return missing;\n}\n"));
     const std::string place = broken.path() + "(3) : error: ";
+    const TemporaryFile endless("endless.cg", bytesOf("#include \"/dev/zero\"\n"));
+    const TemporaryFile blocking("blocking.cg", bytesOf("#include \"pipe\"\n"));
+    const std::string pipe = std::filesystem::path(blocking.path()).replace_filename("pipe");
+    ASSERT_EQ(mkfifo(pipe.c_str(), 0600), 0); // that nobody writes to
+    const TemporaryFile large("large.cg", bytesOf("//"));
+    std::filesystem::resize_file(large.path(), (16 << 20) + 1);
     struct Case {
         const char* file;
         const char* entry;
@@ -226,6 +235,11 @@ TEST_F(CgRuntime, WhatDoesNotCompileIsNullWithAListing) {
     const std::vector<Case> cases = {
         {broken.path().c_str(), nullptr, CG_PROFILE_GLSLF, CG_COMPILER_ERROR, place.c_str()},
         {broken.path().c_str(), "other", CG_PROFILE_GLSLF, CG_COMPILER_ERROR, "other"},
+        {endless.path().c_str(), nullptr, CG_PROFILE_GLSLF, CG_COMPILER_ERROR,
+         "cannot open the included file"},
+        {blocking.path().c_str(), nullptr, CG_PROFILE_GLSLF, CG_COMPILER_ERROR,
+         "cannot open the included file"},
+        {large.path().c_str(), nullptr, CG_PROFILE_GLSLF, CG_FILE_READ_ERROR, "File too large"},
         {"not/there.cg", "main", CG_PROFILE_GLSLF, CG_FILE_READ_ERROR, "not/there.cg"},
         {".", "main", CG_PROFILE_GLSLF, CG_FILE_READ_ERROR, "."},
     };

@@ -4,6 +4,7 @@
 #include <OutputFile.h>
 
 #include <Cg/Compiler/Compiler.h>
+#include <Cg/Compiler/SourceReader.h>
 
 #include <CLI/CLI.hpp>
 
@@ -11,10 +12,8 @@
 #include <array>
 #include <cerrno>
 #include <cstring>
-#include <fstream>
 #include <iomanip>
 #include <iostream>
-#include <iterator>
 #include <map>
 #include <memory>
 #include <sstream>
@@ -34,22 +33,15 @@ struct ShaderOptions {
     bool isWarning = false;
 };
 
-bool readFile(const std::string& path, std::string& text) {
-    std::ifstream file(path, std::ios::binary);
-    text.assign(std::istreambuf_iterator<char>(file), std::istreambuf_iterator<char>());
-    return file.is_open() && !file.bad();
-}
-
 cg::CompileRequest requestOf(const ShaderOptions& options) {
     cg::CompileRequest request;
     const std::string file = host::findCgProgram(options.file);
-    errno = 0;
-    if (!readFile(file, request.source))
+    if (!cg::readSource(file, request.source))
         throw std::runtime_error(file + ": it cannot be read: " + std::strerror(errno));
     request.fileName = file;
     request.entry = options.entry;
     request.stage = options.stage;
-    request.reader = readFile;
+    request.reader = cg::readInclude;
     request.includeFolders = options.includeFolders;
     for (const std::string& macro : options.macros) {
         const size_t equals = macro.find('=');

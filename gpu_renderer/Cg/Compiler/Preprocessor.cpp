@@ -29,6 +29,9 @@ constexpr std::size_t INCLUDE_COST = 200;
 /// Bytes of a spelling that `#` or `##` makes that count as one token.
 constexpr std::size_t SPELLING_COST_BYTES = 16;
 
+/// Bytes of an included file that count as one token: comments and blanks are bounded too.
+constexpr std::size_t INCLUDED_COST_BYTES = 16;
+
 /// Macro calls within the arguments of macro calls.
 constexpr std::size_t MAX_ARGUMENT_DEPTH = 200;
 
@@ -585,6 +588,7 @@ private:
                  inQuotes(name) + " include itself?");
             return;
         }
+        charge(mFiles.text(*file).size() / INCLUDED_COST_BYTES);
         open(*file);
     }
 

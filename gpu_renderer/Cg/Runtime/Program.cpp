@@ -8,12 +8,11 @@
 #include "TextureUnits.h"
 #include "Uniforms.h"
 
+#include <Cg/Compiler/SourceReader.h>
 #include <Cg/Compiler/VaryingPlaces.h>
 
 #include <algorithm>
-#include <array>
 #include <cerrno>
-#include <cstdio>
 #include <cstring>
 #include <memory>
 #include <utility>
@@ -26,21 +25,6 @@ HandleTable<CGprogram, Program> handles;
 
 /// Any vertex program may be drawn with any fragment program.
 VaryingPlaces varyingPlaces;
-
-using FilePointer = std::unique_ptr<std::FILE, int (*)(std::FILE*)>;
-
-/// Reads a whole file; false, with the reason in errno, where that fails.
-bool readFile(const std::string& path, std::string& text) {
-    const FilePointer file(std::fopen(path.c_str(), "rb"), &std::fclose);
-    if (!file)
-        return false;
-    text.clear();
-    std::array<char, 16384> block{};
-    size_t length = 0;
-    while ((length = std::fread(block.data(), 1, block.size(), file.get())) > 0)
-        text.append(block.data(), length);
-    return std::ferror(file.get()) == 0;
-}
 
 /// Takes "-DNAME", "-DNAME=VALUE" and "-Ipath"; passes over the rest.
 void addOptions(const char** args, CompileRequest& request) {
@@ -90,7 +74,7 @@ CGprogram compileInto(Context& context, Program::Origin origin, const char** arg
     request.entry = origin.entry;
     request.stage = origin.profile == CG_PROFILE_GLSLV ? Stage::VERTEX : Stage::FRAGMENT;
     request.target = driver::glslTarget();
-    request.reader = &readFile;
+    request.reader = &readInclude;
     request.varyingPlaces = &varyingPlaces;
     addOptions(args, request);
 
@@ -188,7 +172,7 @@ CGprogram cgCreateProgramFromFile(CGcontext context, CGenum type, const char* fi
     if (!found)
         return nullptr;
     std::string source;
-    if (!cg::readFile(file, source))
+    if (!cg::readSource(file, source))
         return cg::fail(*found, CG_FILE_READ_ERROR,
                         std::string(file) + " : error: cannot read the file: " + std::strerror(errno) + '\n');
     return cg::compileInto(*found, {std::move(source), file, cg::entryOrMain(entry), profile}, args);
