@@ -10,9 +10,10 @@
 
 #include <algorithm>
 #include <atomic>
+#include <ctime>
 
-// What the readers take from the heap for files that nobody sane wrote. What they write is held to its bounds
-// by the tests of each reader.
+// What the readers take from the heap, and of time, for files that nobody sane wrote. What they write is held
+// to its bounds by the tests of each reader.
 
 namespace {
 
@@ -72,10 +73,12 @@ size_t heapBytesOf(Work work) {
     return heapBytes - before;
 }
 
-/// All that is ever done with a file: its size, a fill, and what is said of it.
+/// All that is ever done with a file: its size, a fill, and what is said of it. No file here may take a
+/// second.
 template <class Query, class Fill>
 size_t heapBytesOfReading(const TemporaryFile& file, GuardedTexture& guarded, Query query, Fill fill) {
-    return heapBytesOf([&] {
+    const std::clock_t start = std::clock();
+    const size_t bytes = heapBytesOf([&] {
         uint32_t width = 0;
         uint32_t height = 0;
         uint32_t bytesPerColour = 0;
@@ -83,6 +86,8 @@ size_t heapBytesOfReading(const TemporaryFile& file, GuardedTexture& guarded, Qu
         fill(file.path(), &guarded.texture, 0, 2, 0, false);
         pictureRefusal(file.path());
     });
+    EXPECT_LT(std::clock() - start, CLOCKS_PER_SEC) << "of the processor's time, not of the clock's";
+    return bytes;
 }
 
 size_t heapBytesOfPng(const TemporaryFile& file, GuardedTexture& guarded) {

@@ -8,8 +8,11 @@
 
 #include <array>
 #include <atomic>
+#include <chrono>
 #include <cstdio>
 #include <cstring>
+#include <functional>
+#include <future>
 #include <thread>
 #include <utility>
 
@@ -156,6 +159,20 @@ TEST_F(PboMapping, TheLockCoversTheMappingAloneAndAllOfTheUnmapping) {
     EXPECT_EQ(std::exchange(lockHeld, {}), (std::vector<bool>{true, true, true}));
 }
 
+TEST_F(PboMapping, AProducerWaitsForTheLock) {
+    Texture texture(VideoTestImage::NO_TEST_PATTERN, pboArgs());
+    const std::vector<std::function<void()>> reads = {[&] { texture.getPboPtr(0); },
+                                                      [&] { texture.getAlignedPboPtr(0); }};
+    for (const auto& read : reads) {
+        boost::mutex::scoped_lock mapping(texture.mPboMutex);
+        const std::future<void> producer = std::async(std::launch::async, read);
+        EXPECT_EQ(producer.wait_for(std::chrono::milliseconds(50)), std::future_status::timeout);
+        mapping.unlock();
+    }
+    const boost::mutex::scoped_lock mapping(texture.mPboMutex);
+    EXPECT_EQ(texture.getPboOffset(0), 0U) << "without the lock";
+}
+
 /// The bytes that work() hands on of a text waiting in standard output.
 template <class Work>
 off_t bytesFlushedBy(Work work) {
@@ -223,6 +240,7 @@ TEST_F(PboMapping, EveryFrameOfTheProducersArrivesWhole) {
                 written[b].store(round + 1, std::memory_order_release);
                 (void)texture.getPboOffset(b + 1); // any thread may read any of them at any time
                 (void)texture.getPboPtr(b + 1);
+                (void)texture.getAlignedPboPtr(b + 1);
             }
         });
     std::vector<uint8_t> arrived(frameBytes);

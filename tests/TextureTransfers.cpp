@@ -211,6 +211,11 @@ TEST_F(TextureTransferCalls, ANullHostBufferCopiesNothing) {
         else
             texture.readbackPBOToHostBuf(0);
         texture.mHostBufPtrs[0] = buffer;
+        GLint isMapped = GL_TRUE;
+        glBindBuffer(GL_COPY_READ_BUFFER, texture.getPboID(0));
+        glGetBufferParameteriv(GL_COPY_READ_BUFFER, GL_BUFFER_MAPPED, &isMapped);
+        glBindBuffer(GL_COPY_READ_BUFFER, 0);
+        EXPECT_FALSE(isMapped);
     }
 }
 
