@@ -279,6 +279,11 @@ bool isOpaque(const Type* type) {
     return innermost(type)->isSampler();
 }
 
+bool implements(const Type* type, const Type* interface) {
+    return type->isStruct() && interface->isStruct() && type->structure->interface &&
+           type->structure->interface == interface->structure->declaration;
+}
+
 int countLeaves(const Type* type, int limit) {
     if (type->isArray()) {
         const std::int64_t each = countLeaves(type->element, limit);

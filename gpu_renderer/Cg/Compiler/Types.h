@@ -159,6 +159,9 @@ bool areSameTexture(Sampler a, Sampler b);
 /// A sampler or an array of samplers: nothing that a GLSL struct of ours holds.
 bool isOpaque(const Type* type);
 
+/// The type is a struct that implements the interface.
+bool implements(const Type* type, const Type* interface);
+
 /// Number of scalars, samplers and elements in all; counts no further than `limit`.
 int countLeaves(const Type* type, int limit);
 

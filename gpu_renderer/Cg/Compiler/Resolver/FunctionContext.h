@@ -33,13 +33,12 @@ struct FunctionContext {
 
     Function* function = nullptr;
     std::vector<ScopeEntry> scope;
-    std::vector<LoopVariable> pastLoops;           ///< of the blocks around
-    std::vector<TypedStmt*>* statements = nullptr; ///< of the innermost block
-    Variable* self = nullptr;                      ///< a method's object
-    Variable* declared = nullptr;                  ///< the one whose initial value is being resolved
-    bool isDeclaredUsed = false;                   ///< that value names its own variable
-    std::size_t ordinal = 0;                       ///< of the function's declaration
-    int loops = 0;                                 ///< around the statement
+    std::vector<LoopVariable> pastLoops; ///< of the blocks around
+    Variable* self = nullptr;            ///< a method's object
+    Variable* declared = nullptr;        ///< the one whose initial value is being resolved
+    bool isDeclaredUsed = false;         ///< that value names its own variable
+    std::size_t ordinal = 0;             ///< of the function's declaration
+    int loops = 0;                       ///< around the statement
     int switches = 0;
     bool hasReturn = false;
 };

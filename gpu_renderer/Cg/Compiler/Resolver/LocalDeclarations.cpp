@@ -10,8 +10,6 @@ namespace cg {
 
 TypedStmt* LocalDeclarations::declare(const DeclStmt* stmt) {
     TypedStmt* result = mResolution.makeStatement(TypedStmt::Kind::SEQUENCE);
-    Statements* outer = mResolution.context.statements;
-    mResolution.context.statements = &result->body;
     for (const Decl* declaration : stmt->declarations)
         switch (declaration->kind) {
         case Decl::Kind::VARIABLE:
@@ -26,7 +24,6 @@ TypedStmt* LocalDeclarations::declare(const DeclStmt* stmt) {
         case Decl::Kind::FUNCTION: // a prototype within a function says nothing new
             break;
         }
-    mResolution.context.statements = outer;
     return result;
 }
 

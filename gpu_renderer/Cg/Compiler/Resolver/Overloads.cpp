@@ -177,9 +177,4 @@ std::string Overloads::describe(const FunctionDecl* declaration) {
     return text + ")";
 }
 
-bool implements(const Type* type, const Type* interface) {
-    return type->isStruct() && interface->isStruct() && type->structure->interface &&
-           type->structure->interface == interface->structure->declaration;
-}
-
 } // namespace cg

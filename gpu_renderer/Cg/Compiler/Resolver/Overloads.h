@@ -63,9 +63,6 @@ private:
     std::unordered_map<const FunctionDecl*, Signature> mSignatures;
 };
 
-/// The type is a struct that implements the interface.
-bool implements(const Type* type, const Type* interface);
-
 } // namespace cg
 
 #endif

@@ -41,7 +41,6 @@ TypedExpr* SamplerFunctions::call(SourceLocation at, const FunctionDecl* declara
         return nullptr;
     FunctionContext context;
     context.function = mResolution.context.function;
-    context.statements = mResolution.context.statements;
     context.ordinal = mDeclarations.ordinal(definition);
     if (!bind(definition, arguments, context))
         return nullptr;

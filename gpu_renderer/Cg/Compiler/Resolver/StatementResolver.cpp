@@ -43,7 +43,7 @@ bool endsInDiscard(const TypedStmt* stmt) {
 } // namespace
 
 void StatementResolver::body(Function* function, const FunctionDecl* definition) {
-    function->body = block(definition->body);
+    function->body = block(definition->body->statements);
     endBody(function, definition);
 }
 
@@ -67,7 +67,7 @@ TypedStmt* StatementResolver::statement(const Stmt* stmt) {
         return nullptr;
     switch (stmt->kind) {
     case Stmt::Kind::BLOCK:
-        return block(static_cast<const BlockStmt*>(stmt));
+        return block(static_cast<const BlockStmt*>(stmt)->statements);
     case Stmt::Kind::DECL:
         return mDeclarations.declare(static_cast<const DeclStmt*>(stmt));
     case Stmt::Kind::EXPR:
@@ -97,30 +97,25 @@ TypedStmt* StatementResolver::statement(const Stmt* stmt) {
     return nullptr;
 }
 
-TypedStmt* StatementResolver::block(const BlockStmt* stmt) {
+TypedStmt* StatementResolver::block(const std::vector<Stmt*>& statements) {
     FunctionContext& context = mResolution.context;
     TypedStmt* result = mResolution.makeStatement(Kind::BLOCK);
     const std::size_t outerScope = context.scope.size();
     const std::size_t outerLoops = context.pastLoops.size();
-    std::vector<TypedStmt*>* outerStatements = context.statements;
-    context.statements = &result->body;
-    for (const Stmt* inner : stmt->statements)
+    for (const Stmt* inner : statements)
         if (TypedStmt* resolved = statement(inner))
             result->body.push_back(resolved);
-    context.statements = outerStatements;
     context.scope.resize(outerScope);
     context.pastLoops.resize(outerLoops);
     return result;
 }
 
 /// A branch or a loop's body: always a block, never null.
-TypedStmt* StatementResolver::scoped(const Stmt* stmt) {
-    if (stmt && stmt->kind == Stmt::Kind::BLOCK)
-        return block(static_cast<const BlockStmt*>(stmt));
-    BlockStmt only(stmt ? stmt->location : SourceLocation());
-    if (stmt)
-        only.statements.push_back(const_cast<Stmt*>(stmt));
-    return block(&only);
+TypedStmt* StatementResolver::scoped(Stmt* stmt) {
+    if (!stmt)
+        return block({});
+    return stmt->kind == Stmt::Kind::BLOCK ? block(static_cast<const BlockStmt*>(stmt)->statements)
+                                           : block({stmt});
 }
 
 TypedStmt* StatementResolver::expressionStatement(TypedExpr* expression) {
@@ -177,7 +172,7 @@ TypedStmt* StatementResolver::switchStatement(const SwitchStmt* stmt) {
         return nullptr;
     TypedStmt* result = mResolution.makeStatement(Kind::SWITCH, selector);
     ++mResolution.context.switches;
-    result->body = block(stmt->body)->body;
+    result->body = block(stmt->body->statements)->body;
     --mResolution.context.switches;
     // GLSL wants a statement behind the last label.
     const auto last = std::find_if_not(result->body.rbegin(), result->body.rend(), isEmpty);
@@ -227,9 +222,12 @@ TypedStmt* StatementResolver::returnStatement(const JumpStmt* stmt) {
     if (!value)
         return nullptr;
     if (wanted->isVoid() && value->type->isVoid()) {
-        if (TypedStmt* effect = expressionStatement(value))
-            context.statements->push_back(effect);
-        return result;
+        TypedStmt* effect = expressionStatement(value);
+        if (!effect)
+            return result;
+        TypedStmt* both = mResolution.makeStatement(Kind::SEQUENCE);
+        both->body = {effect, result};
+        return both;
     }
     if (wanted->isVoid()) {
         mResolution.diagnostics.error(stmt->location, "return with a value in a void function");

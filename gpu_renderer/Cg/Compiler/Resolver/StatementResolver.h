@@ -3,6 +3,8 @@
 
 #include <Cg/Compiler/TypedTree.h>
 
+#include <vector>
+
 namespace cg {
 
 class BranchSamplers;
@@ -24,8 +26,8 @@ public:
 
 private:
     TypedStmt* statement(const Stmt* stmt);
-    TypedStmt* block(const BlockStmt* stmt);
-    TypedStmt* scoped(const Stmt* stmt);
+    TypedStmt* block(const std::vector<Stmt*>& statements);
+    TypedStmt* scoped(Stmt* stmt);
     TypedStmt* ifStatement(const IfStmt* stmt);
     TypedStmt* loop(const LoopStmt* stmt);
     TypedStmt* forLoop(const ForStmt* stmt);
