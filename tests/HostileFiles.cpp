@@ -41,17 +41,17 @@ extern "C" void* __libc_malloc(size_t size);
 extern "C" void* __libc_calloc(size_t count, size_t size);
 extern "C" void* __libc_realloc(void* block, size_t size);
 
-extern "C" void* malloc(size_t size) {
+extern "C" __attribute__((visibility("default"))) void* malloc(size_t size) {
     heapBytes += size;
     return __libc_malloc(size);
 }
 
-extern "C" void* calloc(size_t count, size_t size) {
+extern "C" __attribute__((visibility("default"))) void* calloc(size_t count, size_t size) {
     heapBytes += count * size;
     return __libc_calloc(count, size);
 }
 
-extern "C" void* realloc(void* block, size_t size) {
+extern "C" __attribute__((visibility("default"))) void* realloc(void* block, size_t size) {
     heapBytes += size;
     return __libc_realloc(block, size);
 }
