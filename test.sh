@@ -1,10 +1,12 @@
 #!/usr/bin/env bash
 # Sets up what is missing, builds everything and runs every test. An argument names another preset than dev: asan
-# (AddressSanitizer, UBSan, leaks) or tsan (ThreadSanitizer).
+# (AddressSanitizer, UBSan, leaks), tsan (ThreadSanitizer) or clang (the other compiler).
 set -euo pipefail
 cd "$(dirname "${BASH_SOURCE[0]}")"
 preset=${1-dev}
-scripts/install-packages test
+packages=test
+[[ $preset != clang ]] || packages=check
+scripts/install-packages "$packages"
 scripts/configure "$preset"
 cmake --build --preset "$preset"
 exec ctest --preset "$preset" --parallel "$(nproc)"
