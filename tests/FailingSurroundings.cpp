@@ -308,10 +308,12 @@ Scenario buildShader() {
                 for (int attempt = 0; attempt < 2; ++attempt) {
                     std::optional<Shader> shader;
                     const auto build = [&] { shader.emplace(Shader::TYPE_FRAGMENT, cgFile().path(), entry); };
-                    if (attempt == 0)
+                    if (attempt == 0) {
                         exposed(build);
-                    else
+                    } else {
+                        const FailingCall counted(Call::NEW, -1); // its memory too is told from what stays
                         build();
+                    }
                     if (shader) {
                         const bool mayBeNull = attempt == 0 && exposed.hasFailed();
                         EXPECT_TRUE(shader->mCgProgram || mayBeNull);
