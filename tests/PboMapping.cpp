@@ -85,6 +85,30 @@ TEST_F(PboMapping, ReadbackComesFromTheStartOfTheMapping) {
     EXPECT_EQ(std::memcmp(texture.getHostBufPtr(0), mappedMemory.data() + 8, texture.pixelBytes()), 0);
 }
 
+TEST_F(PboMapping, CopiesEndWithAHostBufferOfAShorterPitch) {
+    constexpr size_t HOST_BYTES = size_t{8} * 9 * 4;
+    for (const uint32_t access : {uint32_t{GL_WRITE_ONLY}, uint32_t{GL_READ_ONLY}}) {
+        const bool isUpload = access == GL_WRITE_ONLY;
+        Texture::TexArgs args = pboArgs(access, 1);
+        args.pitchInPix = 9; // of 16
+        args.bufAlignByte = 1;
+        Texture texture(VideoTestImage::NO_TEST_PATTERN, args);
+        const MappingAt mapping(mappedMemory.data());
+        std::array<uint8_t, 1024> hostMemory{};
+        mappedMemory.fill(0xEE);
+        void* const own = std::exchange(texture.mHostBufPtrs[0], hostMemory.data());
+        if (isUpload)
+            texture.copyHostBufToPBO(0);
+        else
+            texture.readbackPBOToHostBuf(0);
+        texture.mHostBufPtrs[0] = own;
+        const auto& target = isUpload ? mappedMemory : hostMemory;
+        const auto& source = isUpload ? hostMemory : mappedMemory;
+        EXPECT_EQ(target[HOST_BYTES - 1], source[0]);
+        EXPECT_NE(target[HOST_BYTES], source[0]);
+    }
+}
+
 TEST_F(PboMapping, AFailedMappingLeavesThePboBound) {
     for (const uint32_t access : {uint32_t{GL_WRITE_ONLY}, uint32_t{GL_READ_ONLY}}) {
         const bool isUpload = access == GL_WRITE_ONLY;

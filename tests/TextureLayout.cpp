@@ -218,6 +218,7 @@ TEST_F(TextureLayout, AHostBufferOfTwoGigabytesIsRefused) {
         {"wraps to 0 in 32 bits", 65536, 65536, 4, 1, false},
         {"wraps to 0 in 64 bits", 0x80000000, 0x80000000, 4, 1, false},
         {"a pitch that wraps alone", 1, 0x40000000, 4, 1, false},
+        {"bytes of a pixel that wrap", 1, 1, 0x10001, 0x10000, false},
     };
     for (const Case& c : cases) {
         SCOPED_TRACE(c.name);
