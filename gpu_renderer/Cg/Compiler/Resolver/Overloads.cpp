@@ -8,6 +8,8 @@
 #include <Cg/Compiler/Resolver/TypeResolver.h>
 
 #include <algorithm>
+#include <set>
+#include <utility>
 
 namespace cg {
 
@@ -23,7 +25,7 @@ bool mayBeOut(const TypedExpr* argument) {
 } // namespace
 
 const Signature& Overloads::signatureOf(const FunctionDecl* declaration) {
-    const auto [slot, isNew] = mSignatures.emplace(declaration, Signature());
+    const auto [slot, isNew] = mSignatures.try_emplace(declaration);
     if (!isNew)
         return slot->second;
     const ContextChange outside(mResolution.context, {}); // its types mean the same for all callers
@@ -38,20 +40,26 @@ const Signature& Overloads::signatureOf(const FunctionDecl* declaration) {
     return mSignatures[declaration] = signature;
 }
 
-Overloads::Functions Overloads::candidates(Name name) {
-    const Functions& all = mDeclarations.functions(name);
+const Overloads::Functions& Overloads::candidates(Name name) {
+    const Functions& all = mDeclarations.functions(name); // in the order of the source
     const std::size_t ordinal = mResolution.context.ordinal;
-    Functions visible;
-    for (const FunctionDecl* function : all)
-        if (ordinal == 0 || mDeclarations.ordinal(function) <= ordinal)
-            visible.push_back(function);
+    const auto end = std::partition_point(all.begin(), all.end(), [&](const FunctionDecl* function) {
+        return ordinal == 0 || mDeclarations.ordinal(function) <= ordinal;
+    });
+    const Functions visible(all.begin(), end == all.begin() ? all.end() : end);
+    if (mCandidates[name].visible != visible.size()) {
+        Functions distinct = distinctOf(visible); // may look up candidates itself
+        mCandidates[name] = {visible.size(), std::move(distinct)};
+    }
+    return mCandidates[name].distinct;
+}
+
+Overloads::Functions Overloads::distinctOf(const Functions& functions) {
     Functions distinct;
-    for (const FunctionDecl* function : visible.empty() ? all : visible) {
+    std::set<std::vector<const Type*>> known;
+    for (const FunctionDecl* function : functions) {
         const Signature& signature = signatureOf(function);
-        const bool isKnown = std::any_of(distinct.begin(), distinct.end(), [&](const FunctionDecl* other) {
-            return signatureOf(other).parameters == signature.parameters;
-        });
-        if (signature.result && !isKnown)
+        if (signature.result && known.insert(signature.parameters).second)
             distinct.push_back(function);
     }
     return distinct;

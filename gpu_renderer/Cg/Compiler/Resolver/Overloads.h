@@ -34,7 +34,7 @@ public:
 
     /// The functions of that name that stand before the one being resolved, or else all of them; each once,
     /// with its body where it has one.
-    Functions candidates(Name name);
+    const Functions& candidates(Name name);
 
     /// The methods of that name; none where the type is no struct.
     Functions methods(const Type* type, Name name) const;
@@ -51,6 +51,13 @@ public:
     void refuse(SourceLocation at, Name name, const Functions& functions, const Arguments& arguments);
 
 private:
+    /// Of the functions of a name: most calls see as many as the call before.
+    struct Candidates {
+        std::size_t visible = 0;
+        Functions distinct;
+    };
+
+    Functions distinctOf(const Functions& functions);
     int argumentCost(const FunctionDecl* function, std::size_t position, const TypedExpr* argument);
     bool takes(const FunctionDecl* function, const Arguments& arguments);
     Functions cheapest(const Functions& functions, std::size_t position, const TypedExpr* argument);
@@ -61,6 +68,7 @@ private:
     const Declarations& mDeclarations;
     TypeResolver& mTypes;
     std::unordered_map<const FunctionDecl*, Signature> mSignatures;
+    std::unordered_map<Name, Candidates> mCandidates;
 };
 
 } // namespace cg
