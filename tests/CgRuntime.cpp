@@ -721,8 +721,15 @@ TEST_F(CgRuntime, EachOpenGlContextHasItsOwnStages) {
         cgGLDisableProfile(CG_PROFILE_GLSLF);
     }
     eglMakeCurrent(display, EGL_NO_SURFACE, EGL_NO_SURFACE, hosts);
-    eglDestroyContext(display, other);
     EXPECT_EQ(FloatCanvas(1, 1).drawnPixel(), (Pixel{1, 2, 3, 4}));
+    cgDestroyProgram(program); // which is bound in the other context
+    eglMakeCurrent(display, EGL_NO_SURFACE, EGL_NO_SURFACE, other);
+    cgGLEnableProfile(CG_PROFILE_GLSLF);
+    EXPECT_EQ(FloatCanvas(1, 1).drawnPixel(), (Pixel{1, 1, 1, 1}));
+    EXPECT_EQ(takeGlErrors(), std::vector<std::string>{});
+    cgGLDisableProfile(CG_PROFILE_GLSLF);
+    eglMakeCurrent(display, EGL_NO_SURFACE, EGL_NO_SURFACE, hosts);
+    eglDestroyContext(display, other);
 }
 
 } // namespace

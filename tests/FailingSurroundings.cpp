@@ -287,9 +287,10 @@ const TemporaryFile& cgFile() {
         "a_program_with_a_name_that_needs_memory.cg",
         bytesOf("float4 Cg_Main(float2 place : TEXCOORD0, uniform sampler2D picture : TEXUNIT3,\n"
                 "               uniform sampler2D a_key_with_a_name_that_needs_memory,\n"
+                "               uniform sampler2D mask : TEXUNIT5,\n"
                 "               uniform float gain[3] = {1, 2, 3}) : COLOR\n"
                 "{ return gain[0] * tex2D(picture, place) *\n"
-                "         tex2D(a_key_with_a_name_that_needs_memory, place).r; }\n"));
+                "         tex2D(a_key_with_a_name_that_needs_memory, place).r * tex2D(mask, place); }\n"));
     return file;
 }
 
