@@ -231,11 +231,12 @@ TypedExpr* TypedBuilder::logical(SourceLocation at, BinaryOp op, TypedExpr* left
 
 TypedExpr* TypedBuilder::conditional(SourceLocation at, TypedExpr* condition, TypedExpr* whenTrue,
                                      TypedExpr* whenFalse) {
+    if (!condition->type->isNumeric())
+        return this->condition(condition); // which tells the error
     if (whenTrue->type->isSampler() && whenFalse->type->isSampler())
         return chooseSampler(at, condition, whenTrue, whenFalse);
     const bool areNumbers = whenTrue->type->isNumeric() && whenFalse->type->isNumeric();
-    if (!condition->type->isNumeric() || (!areNumbers && whenTrue->type != whenFalse->type) ||
-        (areNumbers && !matchShapes(at, whenTrue, whenFalse))) {
+    if (areNumbers ? !matchShapes(at, whenTrue, whenFalse) : whenTrue->type != whenFalse->type) {
         operandError(at, "?:", whenTrue, whenFalse);
         return nullptr;
     }
@@ -281,7 +282,7 @@ TypedExpr* TypedBuilder::chooseComponents(SourceLocation at, TypedExpr* conditio
 /// GLSL has no such expression: the resolver makes a choice among look-ups of it.
 TypedExpr* TypedBuilder::chooseSampler(SourceLocation at, TypedExpr* condition, TypedExpr* whenTrue,
                                        TypedExpr* whenFalse) {
-    if (!areSameTexture(whenTrue->type->sampler, whenFalse->type->sampler) || !condition->type->isNumeric()) {
+    if (!areSameTexture(whenTrue->type->sampler, whenFalse->type->sampler)) {
         operandError(at, "?:", whenTrue, whenFalse);
         return nullptr;
     }
