@@ -390,4 +390,34 @@ TEST(CgConversions, CostWhatChoosesAmongOverloads) {
     }
 }
 
+struct Passed {
+    const char* parameter;
+    const char* argument;
+    bool isDirect; ///< GLSL writes to the argument itself
+};
+
+const Passed PASSED[] = {
+    {"float4", "float4", true},    {"float4", "half4", true},  {"fixed", "float", true},
+    {"half3x3", "float3x3", true}, {"int4", "float4", false},  {"float", "int", false},
+    {"float3", "float1x3", false}, {"float", "float3", false}, {"float2x2", "int2x2", true},
+};
+
+TEST(CgOutArguments, AreWrittenByWayOfAnotherVariableOnlyWhereGlslAsksForIt) {
+    for (const Passed& passed : PASSED) {
+        const std::string argument = passed.argument;
+        const cg::CompileResult result = compileFragment(
+            "void f(inout " + std::string(passed.parameter) + " v) { v = v; } float4 main() : COLOR { " +
+            argument + " a = (" + argument + ")1; f(a); return 1; }");
+        ASSERT_TRUE(result.ok) << argument << '\n' << result.listing;
+        EXPECT_EQ(passed.isDirect, result.glsl.find("f(a)") != std::string::npos) << argument << '\n'
+                                                                                  << result.glsl;
+    }
+}
+
+TEST(CgLookUps, TakeNoFourthCoordinateForADepth) {
+    const cg::CompileResult result =
+        compileFragment("sampler2D s; float4 main(float4 c : COLOR) : COLOR { return tex2D(s, c); }");
+    EXPECT_NE(result.glsl.find("texture(s, c.xy)"), std::string::npos) << result.listing << result.glsl;
+}
+
 } // namespace

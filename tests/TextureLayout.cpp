@@ -122,11 +122,11 @@ std::vector<std::vector<uint8_t>> rowsOf(Texture& texture, uint32_t buffer) {
 
 TEST_F(TextureLayout, EachBufferHoldsItsField) {
     struct Case {
-        bool isInterlaced;
         std::vector<uint32_t> fields;
+        bool isInterlaced;
         bool isFp16 = false;
     };
-    const Case cases[] = {{false, {2, 2}}, {true, {0}}, {true, {0, 1, 0, 1}}, {true, {0, 1}, true}};
+    const Case cases[] = {{{2, 2}, false}, {{0}, true}, {{0, 1, 0, 1}, true}, {{0, 1}, true, true}};
     for (const Case& c : cases) {
         Texture::TexArgs args = smallArgs();
         args.isInterlaced = c.isInterlaced;

@@ -44,7 +44,7 @@ const Overloads::Functions& Overloads::candidates(Name name) {
     const Functions& all = mDeclarations.functions(name); // in the order of the source
     const std::size_t ordinal = mResolution.context.ordinal;
     const auto end = std::partition_point(all.begin(), all.end(), [&](const FunctionDecl* function) {
-        return ordinal == 0 || mDeclarations.ordinal(function) <= ordinal;
+        return mDeclarations.ordinal(function) <= ordinal;
     });
     const Functions visible(all.begin(), end == all.begin() ? all.end() : end);
     if (mCandidates[name].visible != visible.size()) {
@@ -164,10 +164,16 @@ std::string Overloads::objection(const FunctionDecl* function, const Arguments& 
         if (argumentCost(function, i, arguments[i]) != IMPOSSIBLE_CONVERSION)
             continue;
         const std::string argument = "argument " + std::to_string(i + 1);
-        if (directionOf(function->parameters[i]) != Direction::IN && !mayBeOut(arguments[i]))
+        const Direction direction = directionOf(function->parameters[i]);
+        if (direction != Direction::IN && !mayBeOut(arguments[i]))
             return argument + " cannot be written to";
-        return "no conversion of " + argument + " from '" + nameOf(arguments[i]->type) + "' to '" +
-               nameOf(parameters[i]) + "'";
+        const std::string from = "'" + nameOf(arguments[i]->type) + "'";
+        const std::string to = "'" + nameOf(parameters[i]) + "'";
+        const bool isWayBack = direction == Direction::OUT ||
+                               (direction == Direction::INOUT &&
+                                conversionCost(arguments[i], parameters[i]) != IMPOSSIBLE_CONVERSION);
+        return isWayBack ? "no conversion of " + argument + " from " + to + " back to " + from
+                         : "no conversion of " + argument + " from " + from + " to " + to;
     }
     return "it takes " + std::to_string(parameters.size()) +
            (parameters.size() == 1 ? " argument" : " arguments");
