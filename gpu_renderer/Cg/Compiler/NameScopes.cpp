@@ -5,9 +5,8 @@
 namespace cg {
 
 bool NameScopes::isType(std::string_view name) const {
-    const auto found = mMeanings.find(name);
-    if (found != mMeanings.end() && !found->second.empty())
-        return found->second.back();
+    if (const bool* known = mIsType.find(name))
+        return *known;
     const auto [answer, isNew] = mBuiltIn.emplace(name, false);
     if (isNew)
         answer->second = mTypes.find(name) != nullptr;
@@ -15,8 +14,7 @@ bool NameScopes::isType(std::string_view name) const {
 }
 
 bool NameScopes::isDeclared(std::string_view name) const {
-    const auto found = mMeanings.find(name);
-    return found != mMeanings.end() && !found->second.empty();
+    return mIsType.find(name) != nullptr;
 }
 
 bool NameScopes::isVariableOrFunction(std::string_view name) const {
@@ -24,15 +22,8 @@ bool NameScopes::isVariableOrFunction(std::string_view name) const {
 }
 
 void NameScopes::declare(std::string_view name, bool isType) {
-    if (name.empty())
-        return;
-    mMeanings[name].push_back(isType);
-    mDeclared.push_back(name);
-}
-
-void NameScopes::forgetFrom(std::size_t start) {
-    for (; mDeclared.size() > start; mDeclared.pop_back())
-        mMeanings[mDeclared.back()].pop_back();
+    if (!name.empty())
+        mIsType.declare(name, isType);
 }
 
 } // namespace cg

@@ -1,10 +1,11 @@
 #ifndef CG_COMPILER_NAME_SCOPES_H
 #define CG_COMPILER_NAME_SCOPES_H
 
+#include <Cg/Compiler/ScopedNames.h>
+
 #include <cstddef>
 #include <string_view>
 #include <unordered_map>
-#include <vector>
 
 namespace cg {
 
@@ -20,8 +21,8 @@ public:
     /// Opens a scope for as long as it lives.
     class Scope {
     public:
-        explicit Scope(NameScopes& scopes) : mScopes(scopes), mStart(scopes.mDeclared.size()) {}
-        ~Scope() { mScopes.forgetFrom(mStart); }
+        explicit Scope(NameScopes& scopes) : mScopes(scopes), mStart(scopes.mIsType.size()) {}
+        ~Scope() { mScopes.mIsType.endScope(mStart); }
         Scope(const Scope&) = delete;
         Scope& operator=(const Scope&) = delete;
 
@@ -41,12 +42,10 @@ public:
 
 private:
     void declare(std::string_view name, bool isType);
-    void forgetFrom(std::size_t start);
 
     const TypeTable& mTypes;
-    mutable std::unordered_map<std::string_view, bool> mBuiltIn;       ///< answers of mTypes so far
-    std::unordered_map<std::string_view, std::vector<bool>> mMeanings; ///< true for a type, innermost last
-    std::vector<std::string_view> mDeclared;                           ///< in their order
+    mutable std::unordered_map<std::string_view, bool> mBuiltIn; ///< answers of mTypes so far
+    ScopedNames<bool> mIsType;                                   ///< what the program declares
 };
 
 } // namespace cg

@@ -143,7 +143,7 @@ void EntryResolver::addParameter(Function* function, const VariableDecl* paramet
 
 Variable* EntryResolver::uniform(const VariableDecl* parameter, const Type* type) {
     Variable* variable = mGlobals.parameter(parameter, type);
-    mResolution.context.declare(parameter->name, variable);
+    mResolution.context.variables.declare(parameter->name, variable);
     return variable;
 }
 
@@ -155,7 +155,7 @@ Variable* EntryResolver::stageParameter(Function* function, const VariableDecl* 
     inner->direction = directionOf(parameter);
     inner->isConst = parameter->qualifiers.isConst && inner->direction == Direction::IN;
     function->parameters.push_back(inner);
-    mResolution.context.declare(parameter->name, inner);
+    mResolution.context.variables.declare(parameter->name, inner);
     Variable* outer = mResolution.makeVariable(Variable::Storage::LOCAL, parameter->name, type, parameter);
     mResolution.program.arguments.push_back(outer);
     if (containsSampler(type))

@@ -1,27 +1,22 @@
 #include <Cg/Compiler/Resolver/FunctionContext.h>
 
-#include <algorithm>
 #include <utility>
 
 namespace cg {
 
 Variable* FunctionContext::findVariable(Name name) const {
-    for (auto it = scope.rbegin(); it != scope.rend(); ++it)
-        if (it->variable && it->name == name)
-            return it->variable;
-    return nullptr;
+    Variable* const* found = variables.find(name);
+    return found ? *found : nullptr;
 }
 
 const Type* FunctionContext::findType(Name name) const {
-    for (auto it = scope.rbegin(); it != scope.rend(); ++it)
-        if (it->type && it->name == name)
-            return it->type;
-    return nullptr;
+    const Type* const* found = types.find(name);
+    return found ? *found : nullptr;
 }
 
-bool FunctionContext::isInScope(const Variable* variable) const {
-    return std::any_of(scope.begin(), scope.end(),
-                       [variable](const ScopeEntry& entry) { return entry.variable == variable; });
+void FunctionContext::endScope(ScopeStart start) {
+    variables.endScope(start.variables);
+    types.endScope(start.types);
 }
 
 ContextChange::ContextChange(FunctionContext& current, FunctionContext inner)

@@ -1,39 +1,40 @@
 #ifndef CG_COMPILER_RESOLVER_FUNCTION_CONTEXT_H
 #define CG_COMPILER_RESOLVER_FUNCTION_CONTEXT_H
 
+#include <Cg/Compiler/ScopedNames.h>
 #include <Cg/Compiler/TypedTree.h>
 
 #include <cstddef>
-#include <vector>
 
 namespace cg {
 
 /// What belongs to the function that is being resolved.
 struct FunctionContext {
-    struct ScopeEntry {
-        Name name;
-        Variable* variable; ///< null for a type
-        const Type* type;   ///< null for a variable
-    };
-
     /// A variable of a `for` after its loop.
     struct LoopVariable {
         Variable* variable;
         TypedStmt* loop;
     };
 
+    /// Where a scope starts: how much is declared around it.
+    struct ScopeStart {
+        std::size_t variables;
+        std::size_t types;
+    };
+
     /// @return the innermost one of that name, or null
     Variable* findVariable(Name name) const;
     const Type* findType(Name name) const;
 
-    bool isInScope(const Variable* variable) const;
+    bool isInScope(const Variable* variable) const { return variables.hasMeaning(variable->name, variable); }
 
-    void declare(Name name, Variable* variable) { scope.push_back({name, variable, nullptr}); }
-    void declare(Name name, const Type* type) { scope.push_back({name, nullptr, type}); }
+    ScopeStart scopeStart() const { return {variables.size(), types.size()}; }
+    void endScope(ScopeStart start);
 
     Function* function = nullptr;
-    std::vector<ScopeEntry> scope;
-    std::vector<LoopVariable> pastLoops; ///< of the blocks around
+    ScopedNames<Variable*> variables;
+    ScopedNames<const Type*> types;
+    ScopedNames<LoopVariable> pastLoops; ///< of the blocks around
     Variable* self = nullptr;            ///< a method's object
     Variable* declared = nullptr;        ///< the one whose initial value is being resolved
     bool isDeclaredUsed = false;         ///< that value names its own variable

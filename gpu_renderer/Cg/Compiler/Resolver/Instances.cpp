@@ -85,7 +85,7 @@ void Instances::addParameters(Function* function, const std::vector<const Type*>
         variable->direction = directionOf(parameter);
         variable->isConst = parameter->qualifiers.isConst && variable->direction == Direction::IN;
         function->parameters.push_back(variable);
-        mResolution.context.declare(parameter->name, variable);
+        mResolution.context.variables.declare(parameter->name, variable);
     }
 }
 

@@ -28,13 +28,13 @@ TypedStmt* LocalDeclarations::declare(const DeclStmt* stmt) {
 }
 
 void LocalDeclarations::declareStruct(const StructDecl* structure) {
-    const Type* type = mTypes.structType(structure);
-    mResolution.context.declare(structure->name, type);
+    if (const Type* type = mTypes.structType(structure))
+        mResolution.context.types.declare(structure->name, type);
 }
 
 void LocalDeclarations::declareAlias(const TypedefDecl* alias) {
     if (const Type* type = mTypes.typeOf(alias->type, alias->dimensions))
-        mResolution.context.declare(alias->name, type);
+        mResolution.context.types.declare(alias->name, type);
 }
 
 void LocalDeclarations::declareVariable(const VariableDecl* declaration, Statements& out) {
@@ -60,7 +60,7 @@ void LocalDeclarations::declareVariable(const VariableDecl* declaration, Stateme
     variable->isConst = declaration->qualifiers.isConst;
     if (variable->isConst && !context.isDeclaredUsed)
         variable->initializer = value;
-    context.declare(declaration->name, variable);
+    context.variables.declare(declaration->name, variable);
     if (isSized && !isOpaque(variable->type))
         addStatements(variable, value, out);
 }

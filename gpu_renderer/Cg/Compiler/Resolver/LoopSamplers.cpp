@@ -38,7 +38,7 @@ TypedStmt* LoopSamplers::resolve(SourceLocation at, const std::function<TypedStm
     }
     mAliases.forget(start);
     context.function->temporaries.resize(temporaries);
-    context.pastLoops.resize(pastLoops);
+    context.pastLoops.endScope(pastLoops);
     return withSelectors(at, std::move(changes), statement);
 }
 

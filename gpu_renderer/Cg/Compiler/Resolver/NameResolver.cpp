@@ -10,6 +10,7 @@
 #include <Cg/Compiler/StateBindings.h>
 
 #include <algorithm>
+#include <cstddef>
 #include <string>
 #include <vector>
 
@@ -93,10 +94,8 @@ TypedExpr* NameResolver::ofSelf(const NameExpr* expr) {
 /// The variable of a `for` that is used after its loop, as old C++ allowed.
 /// @return null where no loop of the blocks around had one of that name
 Variable* NameResolver::pastLoopVariable(const NameExpr* expr) {
-    const auto& loops = mResolution.context.pastLoops;
-    const auto found = std::find_if(loops.rbegin(), loops.rend(),
-                                    [expr](const auto& past) { return past.variable->name == expr->name; });
-    if (found == loops.rend())
+    const FunctionContext::LoopVariable* found = mResolution.context.pastLoops.find(expr->name);
+    if (!found)
         return nullptr;
     const bool isMovedAlready = found->loop->kind == TypedStmt::Kind::SEQUENCE;
     if (!isMovedAlready) {
@@ -119,9 +118,9 @@ Variable* NameResolver::ownValue(const NameExpr* expr) {
 
 void NameResolver::refuse(const NameExpr* expr) {
     std::vector<Name> known = mDeclarations.globalNames();
-    for (const FunctionContext::ScopeEntry& entry : mResolution.context.scope)
-        if (entry.variable)
-            known.push_back(entry.name);
+    const auto& locals = mResolution.context.variables;
+    for (std::size_t i = 0; i < locals.size(); ++i)
+        known.push_back(locals.nameAt(i));
     mResolution.diagnostics.error(expr->location,
                                   "undeclared name " + inQuotes(expr->name) + suggestion(expr->name, known));
 }

@@ -84,7 +84,7 @@ bool SamplerFunctions::bind(const FunctionDecl* definition, const std::vector<Ty
                        : "a function that gives a sampler takes only values to choose by");
             return false;
         }
-        context.declare(parameter->name, variable);
+        context.variables.declare(parameter->name, variable);
     }
     return true;
 }

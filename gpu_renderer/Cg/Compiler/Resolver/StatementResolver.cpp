@@ -100,13 +100,13 @@ TypedStmt* StatementResolver::statement(const Stmt* stmt) {
 TypedStmt* StatementResolver::block(const std::vector<Stmt*>& statements) {
     FunctionContext& context = mResolution.context;
     TypedStmt* result = mResolution.makeStatement(Kind::BLOCK);
-    const std::size_t outerScope = context.scope.size();
+    const FunctionContext::ScopeStart start = context.scopeStart();
     const std::size_t outerLoops = context.pastLoops.size();
     for (const Stmt* inner : statements)
         if (TypedStmt* resolved = statement(inner))
             result->body.push_back(resolved);
-    context.scope.resize(outerScope);
-    context.pastLoops.resize(outerLoops);
+    context.endScope(start);
+    context.pastLoops.endScope(outerLoops);
     return result;
 }
 
@@ -147,7 +147,7 @@ TypedStmt* StatementResolver::loop(const LoopStmt* stmt) {
 
 TypedStmt* StatementResolver::forLoop(const ForStmt* stmt) {
     FunctionContext& context = mResolution.context;
-    const std::size_t outerScope = context.scope.size();
+    const FunctionContext::ScopeStart start = context.scopeStart();
     TypedStmt* result = mResolution.makeStatement(Kind::FOR);
     TypedStmt* first = statement(stmt->initializer);
     if (stmt->condition)
@@ -157,10 +157,9 @@ TypedStmt* StatementResolver::forLoop(const ForStmt* stmt) {
     ++context.loops;
     result->body = {first, scoped(stmt->body)};
     --context.loops;
-    for (std::size_t i = outerScope; i < context.scope.size(); ++i)
-        if (Variable* variable = context.scope[i].variable)
-            context.pastLoops.push_back({variable, result});
-    context.scope.resize(outerScope);
+    for (std::size_t i = start.variables; i < context.variables.size(); ++i)
+        context.pastLoops.declare(context.variables.nameAt(i), {context.variables.at(i), result});
+    context.endScope(start);
     return result;
 }
 
