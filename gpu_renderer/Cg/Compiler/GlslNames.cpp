@@ -1,6 +1,8 @@
 #include <Cg/Compiler/GlslNames.h>
 
 #include <algorithm>
+#include <charconv>
+#include <cstddef>
 
 namespace cg {
 
@@ -87,31 +89,45 @@ std::string legalName(std::string_view name) {
     return legal;
 }
 
-bool GlslNames::isTaken(const std::string& name) const {
-    return mGlobals.count(name) != 0 || std::find(mLocals.begin(), mLocals.end(), name) != mLocals.end();
-}
-
-std::string GlslNames::distinct(std::string_view wanted) const {
+std::string GlslNames::distinct(std::string_view wanted) {
     std::string name = legalName(wanted);
     if (!isTaken(name))
         return name;
     if (name.back() != '_')
         name += '_';
-    for (int number = 2;; ++number)
+    for (int& number = mNextNumbers.try_emplace(name, 2).first->second;; ++number)
         if (std::string candidate = name + std::to_string(number); !isTaken(candidate))
             return candidate;
 }
 
 std::string GlslNames::global(std::string_view wanted) {
     std::string name = distinct(wanted);
-    mGlobals.insert(name);
+    mTaken.insert(name);
     return name;
 }
 
 std::string GlslNames::local(std::string_view wanted) {
     std::string name = distinct(wanted);
+    mTaken.insert(name);
     mLocals.push_back(name);
     return name;
+}
+
+void GlslNames::closeScope() {
+    for (; mLocals.size() > mScopes.back(); mLocals.pop_back())
+        giveBack(mLocals.back());
+    mScopes.pop_back();
+}
+
+/// The next of its kind takes the name again, with the number that it has.
+void GlslNames::giveBack(const std::string& name) {
+    mTaken.erase(name);
+    const std::size_t digits = name.find_last_not_of("0123456789") + 1;
+    const auto next = mNextNumbers.find(name.substr(0, digits));
+    int number = 0;
+    std::from_chars(name.data() + digits, name.data() + name.size(), number); // 0 where it has none
+    if (next != mNextNumbers.end() && number >= 2)
+        next->second = std::min(next->second, number);
 }
 
 } // namespace cg

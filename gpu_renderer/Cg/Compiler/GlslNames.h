@@ -3,6 +3,7 @@
 
 #include <string>
 #include <string_view>
+#include <unordered_map>
 #include <unordered_set>
 #include <vector>
 
@@ -24,16 +25,15 @@ public:
     std::string local(std::string_view wanted);
 
     void openScope() { mScopes.push_back(mLocals.size()); }
-    void closeScope() {
-        mLocals.resize(mScopes.back());
-        mScopes.pop_back();
-    }
+    void closeScope();
 
 private:
-    bool isTaken(const std::string& name) const;
-    std::string distinct(std::string_view wanted) const;
+    bool isTaken(const std::string& name) const { return mTaken.count(name) != 0; }
+    std::string distinct(std::string_view wanted);
+    void giveBack(const std::string& name);
 
-    std::unordered_set<std::string> mGlobals;
+    std::unordered_set<std::string> mTaken;
+    std::unordered_map<std::string, int> mNextNumbers; ///< behind a name: all below are taken
     std::vector<std::string> mLocals;
     std::vector<std::size_t> mScopes;
 };

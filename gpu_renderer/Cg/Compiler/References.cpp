@@ -1,6 +1,7 @@
 #include <Cg/Compiler/References.h>
 
-#include <algorithm>
+#include <cstddef>
+#include <string_view>
 
 namespace cg {
 
@@ -19,11 +20,6 @@ const Variable* walk(const TypedExpr* expression, std::string& path) {
         path += "." + std::string(
                           object->type->structure->fields[static_cast<std::size_t>(expression->index)].name);
     return variable;
-}
-
-bool isWithin(const std::string& inner, const std::string& outer) {
-    return inner.compare(0, outer.size(), outer) == 0 &&
-           (inner.size() == outer.size() || inner[outer.size()] == '.');
 }
 
 } // namespace
@@ -73,9 +69,16 @@ void References::visit(const TypedStmt* stmt) {
 
 bool References::uses(const Variable* variable, const std::string& path) const {
     const auto found = mPaths.find(variable);
-    return found != mPaths.end() &&
-           std::any_of(found->second.begin(), found->second.end(),
-                       [&](const std::string& used) { return isWithin(path, used) || isWithin(used, path); });
+    if (found == mPaths.end())
+        return false;
+    const auto& used = found->second;
+    for (std::size_t end = 0; end != std::string::npos; end = path.find('.', end + 1)) // what holds it
+        if (used.count(std::string_view(path).substr(0, end)) != 0)
+            return true;
+    if (used.count(path) != 0)
+        return true;
+    const auto part = used.lower_bound(path + '.'); // of itself
+    return part != used.end() && part->compare(0, path.size() + 1, path + '.') == 0;
 }
 
 } // namespace cg

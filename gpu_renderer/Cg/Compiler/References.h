@@ -3,6 +3,7 @@
 
 #include <Cg/Compiler/TypedTree.h>
 
+#include <functional>
 #include <set>
 #include <string>
 #include <unordered_map>
@@ -24,7 +25,7 @@ private:
     void visit(const TypedExpr* expression);
     void note(const Variable* variable, const std::string& path);
 
-    std::unordered_map<const Variable*, std::set<std::string>> mPaths;
+    std::unordered_map<const Variable*, std::set<std::string, std::less<>>> mPaths;
 };
 
 } // namespace cg
