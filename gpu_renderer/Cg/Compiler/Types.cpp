@@ -87,9 +87,13 @@ Sampler withoutDepth(Sampler sampler) {
 } // namespace
 
 int StructType::find(Name field) const {
-    const auto found =
-        std::find_if(fields.begin(), fields.end(), [field](const Field& one) { return one.name == field; });
-    return found == fields.end() ? -1 : static_cast<int>(found - fields.begin());
+    const auto found = positions.find(field);
+    return found == positions.end() ? -1 : found->second;
+}
+
+void StructType::add(const Field& field) {
+    positions.emplace(field.name, static_cast<int>(fields.size()));
+    fields.push_back(field);
 }
 
 TypeTable::TypeTable(Arena& arena) : mArena(arena) {

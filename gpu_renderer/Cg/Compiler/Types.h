@@ -6,6 +6,7 @@
 #include <array>
 #include <map>
 #include <string>
+#include <unordered_map>
 #include <utility>
 #include <vector>
 
@@ -80,9 +81,12 @@ struct Field {
 struct StructType {
     Name name; ///< empty for a nameless one
     const StructDecl* declaration;
-    std::vector<Field> fields;
-    const StructDecl* interface = nullptr; ///< what it implements
-    bool hasSamplers = false;              ///< at any depth
+    std::vector<Field> fields;               ///< grows by add()
+    std::unordered_map<Name, int> positions; ///< of the first field of each name
+    const StructDecl* interface = nullptr;   ///< what it implements
+    bool hasSamplers = false;                ///< at any depth
+
+    void add(const Field& field);
 
     /// @return position in `fields`, or -1
     int find(Name field) const;

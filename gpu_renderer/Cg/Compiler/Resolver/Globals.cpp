@@ -9,8 +9,6 @@
 #include <Cg/Compiler/Resolver/TypeResolver.h>
 #include <Cg/Compiler/StateBindings.h>
 
-#include <algorithm>
-
 namespace cg {
 
 namespace {
@@ -74,8 +72,8 @@ Variable* Globals::parameter(const VariableDecl* declaration, const Type* type) 
 }
 
 bool Globals::has(const Variable* variable) const {
-    return std::any_of(mVariables.begin(), mVariables.end(),
-                       [variable](const auto& global) { return global.second == variable; });
+    const auto found = mVariables.find(variable->declaration);
+    return found != mVariables.end() && found->second == variable;
 }
 
 /// Decides what a global is. Leaves the type null after an error.

@@ -3,7 +3,7 @@
 #include <Cg/Compiler/Diagnostics.h>
 #include <Cg/Compiler/Resolver/Resolution.h>
 
-#include <algorithm>
+#include <unordered_set>
 
 namespace cg {
 
@@ -36,10 +36,10 @@ std::vector<SamplerAliases::Gift> SamplerAliases::giftsSince(Mark mark) const {
 
 std::vector<SamplerAliases::Assigned> SamplerAliases::takeBack(Mark mark) {
     std::vector<Assigned> last;
+    std::unordered_set<const Variable*> known;
     for (std::size_t i = mark.assignments; i < mAssigned.size(); ++i) {
         Variable* variable = mAssigned[i].variable;
-        const auto isIt = [variable](const Assigned& known) { return known.variable == variable; };
-        if (std::none_of(last.begin(), last.end(), isIt))
+        if (known.insert(variable).second)
             last.push_back({variable, variable->alias});
     }
     for (; mAssigned.size() > mark.assignments; mAssigned.pop_back())

@@ -133,7 +133,8 @@ void TypeResolver::setBase(StructType* structure) {
     else if (base->structure->declaration->isInterface)
         structure->interface = base->structure->declaration;
     else
-        structure->fields = base->structure->fields;
+        for (const Field& field : base->structure->fields)
+            structure->add(field);
 }
 
 void TypeResolver::addMembers(StructType* structure) {
@@ -145,7 +146,7 @@ void TypeResolver::addMembers(StructType* structure) {
             mResolution.diagnostics.error(member->location, "a member cannot be void");
             continue;
         }
-        structure->fields.push_back({member->name, type, member});
+        structure->add({member->name, type, member});
     }
     for (const Field& field : structure->fields)
         structure->hasSamplers = structure->hasSamplers || containsSampler(field.type);
