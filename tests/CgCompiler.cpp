@@ -414,10 +414,25 @@ TEST(CgOutArguments, AreWrittenByWayOfAnotherVariableOnlyWhereGlslAsksForIt) {
     }
 }
 
-TEST(CgLookUps, TakeNoFourthCoordinateForADepth) {
-    const cg::CompileResult result =
-        compileFragment("sampler2D s; float4 main(float4 c : COLOR) : COLOR { return tex2D(s, c); }");
-    EXPECT_NE(result.glsl.find("texture(s, c.xy)"), std::string::npos) << result.listing << result.glsl;
+struct LookUp {
+    const char* sampler;
+    const char* call;
+    const char* glsl;
+};
+
+const LookUp LOOK_UPS[] = {
+    {"picture", "tex2D(picture, c)", "texture(picture, c.xy)"},
+    {"picture", "tex2Dproj(picture, c)", "textureProj(picture, c)"},
+    {"shadowMap", "tex2Dproj(shadowMap, c)", "shadow2DProj(shadowMap, c)"},
+};
+
+TEST(CgLookUps, TakeAFourthCoordinateForWhatTheFunctionDoesWithIt) {
+    for (const LookUp& lookUp : LOOK_UPS) {
+        const cg::CompileResult result =
+            compileFragment("sampler2D " + std::string(lookUp.sampler) +
+                            "; float4 main(float4 c : COLOR) : COLOR { return " + lookUp.call + "; }");
+        EXPECT_NE(result.glsl.find(lookUp.glsl), std::string::npos) << result.listing << result.glsl;
+    }
 }
 
 } // namespace
