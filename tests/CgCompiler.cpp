@@ -315,6 +315,86 @@ TEST(CgDeclarations, ThatLeadToOthersAreBounded) {
         }
 }
 
+/// A name means what its innermost scope says, and what it meant before where that ends.
+TEST(CgScopes, EndWithWhatTheirNamesMeantBefore) {
+    const cg::CompileResult result =
+        compileFragment("typedef float T;\n"
+                        "float4 main(float4 a : TEXCOORD0) : COLOR {\n"
+                        "    float v = a.x;\n"
+                        "    { typedef float2 T; T v = a.xy; { float3 v = a.xyz; v.z = 1; a.xyz += v; }\n"
+                        "      v.y = 2; a.xy += v; }\n"
+                        "    { float4 v = a; v.w = 3; a += v; }\n"
+                        "    T w = v;\n"
+                        "    for (int i = 0; i < 2; ++i) { }\n"
+                        "    { for (int i = 5; i < 7; ++i) { } a.x += i; }\n"
+                        "    return a + v + w + i;\n"
+                        "}\n");
+    EXPECT_TRUE(result.ok) << result.listing;
+    EXPECT_NE(result.glsl.find("float w = v;"), std::string::npos) << result.glsl;
+    EXPECT_NE(result.glsl.find("vec3 v_3 = a.xyz;"), std::string::npos) << result.glsl;
+    EXPECT_NE(result.glsl.find("vec4 v_2 = a;"), std::string::npos) << result.glsl;
+}
+
+/// The program is refused for the reason where it has one piece more than it may have.
+TEST(CgPrograms, ThatAskForTooMuchAreRefused) {
+    struct Growth {
+        const char* head;
+        const char* piece;
+        const char* tail;
+        int limit;
+        const char* reason;
+    };
+    const Growth growths[] = {
+        {"float f(float a[1]) { return 1; }", "float f(float a[#]);",
+         "float4 main() : COLOR { float a[1]; return f(a); }", 256, "more than 256 functions are called 'f'"},
+        {"struct S { float a;", "float f(float a[#]) { return 1; }",
+         "}; float4 main() : COLOR { S s; s.a = 1; float a[2]; a[0] = 1; return s.f(a); }", 257,
+         "more than 256 functions are called 'f'"},
+        {"sampler2D t; sampler2D u; float4 main(float2 p : TEXCOORD0) : COLOR { for (int i = 0; i < 2; ++i) "
+         "{ }",
+         "sampler2D s# = t;", "for (int i = 0; i < 2; ++i) {#} return 1; }", 65,
+         "more than 64 samplers are assigned in a loop or a switch"},
+    };
+    for (const Growth& growth : growths)
+        for (const bool isOver : {false, true}) {
+            std::string source = growth.head;
+            std::string assignments;
+            for (int i = 2; i <= growth.limit + (isOver ? 1 : 0); ++i) {
+                source += numbered(growth.piece, i) + '\n';
+                assignments += numbered("s# = u;", i);
+            }
+            std::string tail = growth.tail;
+            if (const std::size_t place = tail.find('#'); place != std::string::npos)
+                tail.replace(place, 1, assignments);
+            const cg::CompileResult result = compileFragment(source + tail);
+            EXPECT_EQ(result.ok, !isOver) << growth.piece << '\n' << result.listing.substr(0, 500);
+            EXPECT_EQ(result.listing.find(growth.reason) != std::string::npos, isOver)
+                << result.listing.substr(0, 500);
+        }
+}
+
+/// A few words ask for more than any driver would take.
+TEST(CgPrograms, ThatAreTooLargeWhenWrittenOutAreRefused) {
+    std::string zeros;
+    std::string derived;
+    for (int i = 0; i < 100; ++i)
+        zeros += numbered("float z#[60000] = {};\n", i);
+    std::string members;
+    for (int i = 0; i < 3000; ++i) {
+        members += numbered("float m#;", i);
+        derived += numbered("struct D# : S { float x; }; D# d#;\n", i);
+    }
+    for (const std::string& source :
+         {"float4 main() : COLOR { " + zeros + "return z0[0]; }",
+          "struct S { " + members + " }; float4 main() : COLOR { " + derived + "return 1; }"}) {
+        const cg::CompileResult result = compileFragment(source);
+        EXPECT_FALSE(result.ok);
+        EXPECT_NE(result.listing.find("the program is too large"), std::string::npos)
+            << source.substr(0, 100) << '\n'
+            << result.listing.substr(0, 500);
+    }
+}
+
 TEST(CgParameters, OfTheEntryThatAreStaticSamplersAreUniforms) {
     EXPECT_EQ(parametersOf("uniform sampler2D t;\n"
                            "float4 main(static sampler2D s = t, float2 uv : TEXCOORD0) : COLOR {\n"

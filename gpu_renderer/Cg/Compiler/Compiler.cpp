@@ -86,7 +86,11 @@ CompileResult compile(const CompileRequest& request) {
     CompileResult result;
     SourceFiles files;
     Diagnostics diagnostics;
-    translate(request, files, diagnostics, result);
+    try {
+        translate(request, files, diagnostics, result);
+    } catch (const Arena::Full&) {
+        diagnostics.error({}, "the program is too large when its arrays and structs are written out");
+    }
     result.listing = diagnostics.listing(files);
     return result;
 }

@@ -79,12 +79,14 @@ struct Field {
 };
 
 struct StructType {
+    using Positions = std::unordered_map<Name, int>;
+
     Name name; ///< empty for a nameless one
     const StructDecl* declaration;
-    std::vector<Field> fields;               ///< grows by add()
-    std::unordered_map<Name, int> positions; ///< of the first field of each name
-    const StructDecl* interface = nullptr;   ///< what it implements
-    bool hasSamplers = false;                ///< at any depth
+    std::vector<Field> fields;             ///< grows by add()
+    Positions positions;                   ///< of the first field of each name
+    const StructDecl* interface = nullptr; ///< what it implements
+    bool hasSamplers = false;              ///< at any depth
 
     void add(const Field& field);
 

@@ -53,7 +53,7 @@ TypedExpr* Calls::callMember(const MemberExpr* callee, const Arguments& argument
     const Name name = callee->name;
     if (object->type->isArray() && name == "length" && arguments.empty())
         return mResolution.number(at, object->type->length);
-    const Overloads::Functions methods = mOverloads.methods(object->type, name);
+    const Overloads::Functions& methods = mOverloads.methods(object->type, name);
     if (methods.empty()) {
         mResolution.diagnostics.error(at, "'" + nameOf(object->type) + "' has no method " + inQuotes(name));
         return nullptr;
@@ -69,7 +69,7 @@ TypedExpr* Calls::callNamed(const CallExpr* expr, Name name, const Arguments& ar
     if (Variable* self = mResolution.context.self)
         if (const FunctionDecl* method = mOverloads.choose(mOverloads.methods(self->type, name), arguments))
             return mFunctions.call(at, method, arguments, mResolution.build.variable(at, self));
-    const Overloads::Functions functions = mOverloads.candidates(name);
+    const Overloads::Functions& functions = mOverloads.candidates(name);
     if (!functions.empty())
         return callOwn(at, name, functions, arguments);
     if (mBuiltins.has(name, arguments.size()))

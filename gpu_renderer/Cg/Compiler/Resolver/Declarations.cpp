@@ -17,6 +17,7 @@ void appendNames(const Map& map, std::vector<Name>& names) {
 }
 
 const std::vector<const FunctionDecl*> NO_FUNCTIONS;
+const Declarations::Functions NO_METHODS;
 
 } // namespace
 
@@ -54,7 +55,7 @@ void Declarations::add(const FunctionDecl* function, std::size_t ordinal) {
     if (function->ownerName.empty())
         mFunctions[function->name].push_back(function);
     else
-        mOutsideMethods[function->ownerName].push_back(function);
+        mOutsideMethods[function->ownerName][function->name].push_back(function);
 }
 
 void Declarations::add(const StructDecl* structure, std::size_t ordinal) {
@@ -93,9 +94,9 @@ const std::vector<const FunctionDecl*>& Declarations::functions(Name name) const
     return found == mFunctions.end() ? NO_FUNCTIONS : found->second;
 }
 
-const std::vector<const FunctionDecl*>& Declarations::outsideMethods(Name owner) const {
+const Declarations::Functions& Declarations::outsideMethods(Name owner) const {
     const auto found = mOutsideMethods.find(owner);
-    return found == mOutsideMethods.end() ? NO_FUNCTIONS : found->second;
+    return found == mOutsideMethods.end() ? NO_METHODS : found->second;
 }
 
 std::size_t Declarations::ordinal(const FunctionDecl* function) const {

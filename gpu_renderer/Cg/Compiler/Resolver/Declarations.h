@@ -13,6 +13,8 @@ namespace cg {
 /// keeps its first meaning; a global's later declaration may bring its initializer.
 class Declarations {
 public:
+    using Functions = std::unordered_map<Name, std::vector<const FunctionDecl*>>;
+
     explicit Declarations(const TranslationUnit& unit);
 
     /// @return null where the program has none of that name
@@ -23,8 +25,8 @@ public:
     /// @return all of that name, prototypes as well, in the order of the source
     const std::vector<const FunctionDecl*>& functions(Name name) const;
 
-    /// @return all methods of a struct with the name that stand outside of it: `Light::shade`
-    const std::vector<const FunctionDecl*>& outsideMethods(Name owner) const;
+    /// @return the methods of a struct that stand outside of it, by name: `Light::shade`
+    const Functions& outsideMethods(Name owner) const;
 
     /// @return how many declarations of the program stand before the function's, and itself; 0 where it is
     ///         none of them
@@ -39,8 +41,6 @@ public:
     std::vector<Name> globalNames() const;
 
 private:
-    using Functions = std::unordered_map<Name, std::vector<const FunctionDecl*>>;
-
     void add(const VariableDecl* variable);
     void add(const FunctionDecl* function, std::size_t ordinal);
     void add(const StructDecl* structure, std::size_t ordinal);
@@ -52,7 +52,7 @@ private:
     std::unordered_map<Name, const TypedefDecl*> mTypedefs;
     std::unordered_map<Name, const VariableDecl*> mGlobals;
     Functions mFunctions;
-    Functions mOutsideMethods; ///< by owner
+    std::unordered_map<Name, Functions> mOutsideMethods; ///< by owner
     std::unordered_map<const FunctionDecl*, std::size_t> mOrdinals;
 };
 

@@ -19,6 +19,9 @@ namespace {
 /// Loops and switches that assign samplers, in a whole program: each is resolved twice.
 constexpr int MAX_SELECTIONS = 256;
 
+/// Samplers that one of them assigns: each may stand for whatever any of them is given.
+constexpr std::size_t MAX_CHANGED = 64;
+
 } // namespace
 
 TypedStmt* LoopSamplers::resolve(SourceLocation at, const std::function<TypedStmt*()>& statement) {
@@ -64,9 +67,15 @@ bool LoopSamplers::findChanges(SourceLocation at, SamplerAliases::Mark start, Ch
             return false;
         }
         changes.given.push_back(gift.sampler);
-        if (std::find(changes.variables.begin(), changes.variables.end(), gift.variable) ==
+        if (std::find(changes.variables.begin(), changes.variables.end(), gift.variable) !=
             changes.variables.end())
-            changes.variables.push_back(gift.variable);
+            continue;
+        if (changes.variables.size() == MAX_CHANGED) {
+            mResolution.diagnostics.error(at, "more than " + std::to_string(MAX_CHANGED) +
+                                                  " samplers are assigned in a loop or a switch");
+            return false;
+        }
+        changes.variables.push_back(gift.variable);
     }
     return true;
 }

@@ -17,6 +17,11 @@ namespace {
 
 using Kind = TypedExpr::Kind;
 
+/// Each call looks at all functions of its name: more is no program but an attack.
+constexpr std::size_t MAX_OVERLOADS = 256;
+
+const Overloads::Functions NONE;
+
 /// A function could write to it.
 bool mayBeOut(const TypedExpr* argument) {
     return rootVariable(argument) || argument->kind == Kind::CONSTRUCT;
@@ -41,7 +46,7 @@ const Signature& Overloads::signatureOf(const FunctionDecl* declaration) {
 }
 
 const Overloads::Functions& Overloads::candidates(Name name) {
-    const Functions& all = mDeclarations.functions(name); // in the order of the source
+    const Functions& all = bounded(mDeclarations.functions(name), name); // in the order of the source
     const std::size_t ordinal = mResolution.context.ordinal;
     const auto end = std::partition_point(all.begin(), all.end(), [&](const FunctionDecl* function) {
         return mDeclarations.ordinal(function) <= ordinal;
@@ -52,6 +57,16 @@ const Overloads::Functions& Overloads::candidates(Name name) {
         mCandidates[name] = {visible.size(), std::move(distinct)};
     }
     return mCandidates[name].distinct;
+}
+
+/// @return the functions, or none where they are too many
+const Overloads::Functions& Overloads::bounded(const Functions& functions, Name name) {
+    if (functions.size() <= MAX_OVERLOADS)
+        return functions;
+    mResolution.diagnostics.error(functions[MAX_OVERLOADS]->location,
+                                  "more than " + std::to_string(MAX_OVERLOADS) + " functions are called " +
+                                      inQuotes(name));
+    return NONE;
 }
 
 Overloads::Functions Overloads::distinctOf(const Functions& functions) {
@@ -65,29 +80,40 @@ Overloads::Functions Overloads::distinctOf(const Functions& functions) {
     return distinct;
 }
 
-Overloads::Functions Overloads::methods(const Type* type, Name name) const {
-    Functions methods;
+const Overloads::Functions& Overloads::methods(const Type* type, Name name) {
     if (!type->isStruct())
-        return methods;
+        return NONE;
     const StructDecl* declaration = type->structure->declaration;
-    for (const FunctionDecl* method : declaration->methods)
-        if (method->name == name)
-            methods.push_back(method);
-    for (const FunctionDecl* method : mDeclarations.outsideMethods(declaration->name))
-        if (method->name == name)
-            methods.push_back(method);
-    return methods;
+    const auto [known, isNew] = mMethods.try_emplace(declaration);
+    auto& methods = known->second;
+    if (isNew) {
+        for (const FunctionDecl* method : declaration->methods)
+            methods[method->name].push_back(method);
+        for (const auto& [outsideName, outside] : mDeclarations.outsideMethods(declaration->name)) {
+            Functions& all = methods[outsideName];
+            all.insert(all.end(), outside.begin(), outside.end());
+        }
+    }
+    const auto found = methods.find(name);
+    return found == methods.end() ? NONE : bounded(found->second, name);
+}
+
+/// The functions that may be the body of a prototype.
+const Overloads::Functions& Overloads::declarationsLike(const FunctionDecl* declaration) const {
+    if (declaration->ownerName.empty())
+        return mDeclarations.functions(declaration->name);
+    const auto& methods = mDeclarations.outsideMethods(declaration->ownerName);
+    const auto found = methods.find(declaration->name);
+    return found == methods.end() ? NONE : found->second;
 }
 
 const FunctionDecl* Overloads::definitionOf(const FunctionDecl* declaration) {
     if (declaration->body)
         return declaration;
-    const Functions& all = declaration->ownerName.empty()
-                               ? mDeclarations.functions(declaration->name)
-                               : mDeclarations.outsideMethods(declaration->ownerName);
+    const Functions& all = declarationsLike(declaration);
     const std::vector<const Type*> wanted = signatureOf(declaration).parameters;
     const auto found = std::find_if(all.begin(), all.end(), [&](const FunctionDecl* other) {
-        return other->body && other->name == declaration->name && signatureOf(other).parameters == wanted;
+        return other->body && signatureOf(other).parameters == wanted;
     });
     return found == all.end() ? nullptr : *found;
 }

@@ -33,11 +33,11 @@ public:
     const Signature& signatureOf(const FunctionDecl* declaration);
 
     /// The functions of that name that stand before the one being resolved, or else all of them; each once,
-    /// with its body where it has one.
+    /// with its body where it has one. None where they are too many, which is an error.
     const Functions& candidates(Name name);
 
     /// The methods of that name; none where the type is no struct.
-    Functions methods(const Type* type, Name name) const;
+    const Functions& methods(const Type* type, Name name);
 
     /// @return the function with its body, or null
     const FunctionDecl* definitionOf(const FunctionDecl* declaration);
@@ -58,6 +58,8 @@ private:
     };
 
     Functions distinctOf(const Functions& functions);
+    const Functions& bounded(const Functions& functions, Name name);
+    const Functions& declarationsLike(const FunctionDecl* declaration) const;
     int argumentCost(const FunctionDecl* function, std::size_t position, const TypedExpr* argument);
     bool takes(const FunctionDecl* function, const Arguments& arguments);
     Functions cheapest(const Functions& functions, std::size_t position, const TypedExpr* argument);
@@ -69,6 +71,7 @@ private:
     TypeResolver& mTypes;
     std::unordered_map<const FunctionDecl*, Signature> mSignatures;
     std::unordered_map<Name, Candidates> mCandidates;
+    std::unordered_map<const StructDecl*, std::unordered_map<Name, Functions>> mMethods;
 };
 
 } // namespace cg

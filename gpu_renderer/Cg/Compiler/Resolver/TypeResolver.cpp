@@ -133,8 +133,15 @@ void TypeResolver::setBase(StructType* structure) {
     else if (base->structure->declaration->isInterface)
         structure->interface = base->structure->declaration;
     else
-        for (const Field& field : base->structure->fields)
-            structure->add(field);
+        inherit(structure, base->structure);
+}
+
+/// A few words give a struct all members of a large one, so that they count.
+void TypeResolver::inherit(StructType* structure, const StructType* base) {
+    mResolution.arena.charge(base->fields.size() *
+                             (sizeof(Field) + sizeof(StructType::Positions::value_type)));
+    for (const Field& field : base->fields)
+        structure->add(field);
 }
 
 void TypeResolver::addMembers(StructType* structure) {

@@ -37,6 +37,7 @@ private:
     const Type* aliasType(const TypedefDecl* alias);
     const Type* withDimensions(SourceLocation at, const Type* type, const std::vector<Expr*>& dimensions);
     int arrayLength(const Expr* dimension);
+    void inherit(StructType* structure, const StructType* base);
     void setBase(StructType* structure);
     void addMembers(StructType* structure);
 
