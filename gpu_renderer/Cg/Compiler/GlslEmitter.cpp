@@ -3,7 +3,6 @@
 #include <Cg/Compiler/GlslFunctions.h>
 #include <Cg/Compiler/GlslSymbols.h>
 
-#include <algorithm>
 #include <cstddef>
 
 namespace cg {
@@ -158,10 +157,13 @@ std::string GlslEmitter::output(const StageValue& value) {
                              : slot.glsl + " = " + slot.twin + " = " + text + ";";
 }
 
-bool GlslEmitter::isOnlyOutput(const Variable* argument) const {
-    return std::none_of(mProgram.values.begin(), mProgram.values.end(), [argument](const StageValue& value) {
-        return !value.isOutput && rootVariable(value.place) == argument;
-    });
+/// The arguments of the entry that inputs are a part of.
+std::unordered_set<const Variable*> GlslEmitter::inputArguments() const {
+    std::unordered_set<const Variable*> arguments;
+    for (const StageValue& value : mProgram.values)
+        if (!value.isOutput)
+            arguments.insert(rootVariable(value.place));
+    return arguments;
 }
 
 /// Where an input goes: its argument is declared here, unless it is a part of one.
@@ -191,8 +193,9 @@ std::string GlslEmitter::mainFunction() {
     for (const Variable* variable : mProgram.globals)
         if (mSymbols.isNamed(variable) && variable->initializer && !variable->isConstantExpression)
             line(mSymbols.variableName(variable) + " = " + mExpressions.value(variable->initializer) + ";");
+    const std::unordered_set<const Variable*> inputs = inputArguments();
     for (const Variable* variable : mProgram.arguments)
-        if (!variable->type->isScalarOrVector() || isOnlyOutput(variable))
+        if (!variable->type->isScalarOrVector() || inputs.count(variable) == 0)
             line(mSymbols.declare(variable->type, mSymbols.variableName(variable)) + ";");
     for (const StageValue& value : mProgram.values)
         if (!value.isOutput)

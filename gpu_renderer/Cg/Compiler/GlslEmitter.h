@@ -27,7 +27,7 @@ private:
     std::string stageDeclarations() const;
     std::string mainFunction();
     void structDefinition(const Type* type, std::string& text, std::unordered_set<const Type*>& done);
-    bool isOnlyOutput(const Variable* argument) const;
+    std::unordered_set<const Variable*> inputArguments() const;
     std::string place(const StageValue& value);
     std::string input(const StageValue& value);
     std::string output(const StageValue& value);

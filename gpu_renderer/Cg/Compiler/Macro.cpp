@@ -5,6 +5,8 @@
 #include <Cg/Compiler/SourceFiles.h>
 
 #include <algorithm>
+#include <cstddef>
+#include <string>
 #include <utility>
 
 namespace cg {
@@ -14,10 +16,18 @@ namespace {
 /// What the parameter that takes all further arguments is called unless `args...` names it.
 constexpr std::string_view VARIADIC_NAME = "__VA_ARGS__";
 
+/// Each token of a macro's body is looked for among them.
+constexpr std::size_t MAX_PARAMETERS = 256;
+
 bool addParameter(Macro& macro, const Token& name, Diagnostics& diagnostics) {
     if (std::find(macro.parameters.begin(), macro.parameters.end(), name.text) != macro.parameters.end()) {
         diagnostics.error(name.location, "macro " + inQuotes(macro.name) + " has two parameters named " +
                                              inQuotes(name.text));
+        return false;
+    }
+    if (macro.parameters.size() == MAX_PARAMETERS) {
+        diagnostics.error(name.location, "macro " + inQuotes(macro.name) + " has more than " +
+                                             std::to_string(MAX_PARAMETERS) + " parameters");
         return false;
     }
     macro.parameters.push_back(name.text);

@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <cstdint>
+#include <limits>
 
 namespace cg {
 
@@ -92,6 +93,9 @@ int StructType::find(Name field) const {
 }
 
 void StructType::add(const Field& field) {
+    constexpr int MOST = std::numeric_limits<int>::max();
+    leaves =
+        static_cast<int>(std::min<std::int64_t>(MOST, std::int64_t{leaves} + countLeaves(field.type, MOST)));
     positions.emplace(field.name, static_cast<int>(fields.size()));
     fields.push_back(field);
 }
@@ -293,12 +297,7 @@ int countLeaves(const Type* type, int limit) {
         const std::int64_t each = countLeaves(type->element, limit);
         return static_cast<int>(std::min<std::int64_t>(limit, each * std::max(type->length, 0)));
     }
-    if (!type->isStruct())
-        return type->components();
-    std::int64_t count = 0;
-    for (const Field& field : type->structure->fields)
-        count = std::min<std::int64_t>(limit, count + countLeaves(field.type, limit));
-    return static_cast<int>(count);
+    return std::min(limit, type->isStruct() ? type->structure->leaves : type->components());
 }
 
 } // namespace cg

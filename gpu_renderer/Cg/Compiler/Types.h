@@ -85,6 +85,7 @@ struct StructType {
     const StructDecl* declaration;
     std::vector<Field> fields;             ///< grows by add()
     Positions positions;                   ///< of the first field of each name
+    int leaves = 0;                        ///< of all fields, as countLeaves() counts
     const StructDecl* interface = nullptr; ///< what it implements
     bool hasSamplers = false;              ///< at any depth
 
