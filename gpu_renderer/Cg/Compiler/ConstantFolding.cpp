@@ -154,12 +154,20 @@ public:
     }
 
 private:
+    static bool isKnown(const Variable* variable) {
+        return variable->isConst && !variable->isWritten && variable->initializer;
+    }
+
     MaybeValues constantVariable(const Variable* variable) {
-        const bool isKnown = variable->isConst && !variable->isWritten && variable->initializer;
-        if (!isKnown || mDepth > MAX_DEPTH)
+        return isKnown(variable) ? within(variable->initializer) : std::nullopt;
+    }
+
+    /// Of an expression that stands elsewhere.
+    MaybeValues within(const TypedExpr* expression) {
+        if (mDepth > MAX_DEPTH)
             return std::nullopt;
         ++mDepth;
-        MaybeValues values = evaluate(variable->initializer);
+        MaybeValues values = evaluate(expression);
         --mDepth;
         return values;
     }
@@ -176,9 +184,13 @@ private:
     }
 
     MaybeValues element(const TypedExpr* expression) {
-        const MaybeValues object = evaluate(expression->operands[0]);
         const MaybeValues index = evaluate(expression->operands[1]);
-        if (!object || !index || index->front() < 0)
+        if (!index || index->front() < 0)
+            return std::nullopt;
+        if (const TypedExpr* alone = elementOf(expression, static_cast<std::size_t>(index->front())))
+            return within(alone);
+        const MaybeValues object = evaluate(expression->operands[0]);
+        if (!object)
             return std::nullopt;
         const auto size =
             static_cast<std::size_t>(countLeaves(expression->type, std::numeric_limits<int>::max()));
@@ -187,6 +199,18 @@ private:
             return std::nullopt;
         const auto begin = object->begin() + static_cast<std::ptrdiff_t>(first);
         return Values(begin, begin + static_cast<std::ptrdiff_t>(size));
+    }
+
+    /// What gives the element of a listed array, or null. It is evaluated alone, since thousands of sizes may
+    /// ask a table of thousands.
+    static const TypedExpr* elementOf(const TypedExpr* expression, std::size_t position) {
+        const TypedExpr* array = expression->operands[0];
+        const bool isNamed = array->kind == Kind::VARIABLE && isKnown(array->variable);
+        const TypedExpr* list = isNamed ? array->variable->initializer : array;
+        if (list->kind != Kind::CONSTRUCT || !list->type->isArray() || position >= list->operands.size())
+            return nullptr;
+        const TypedExpr* element = list->operands[position];
+        return element->type == expression->type ? element : nullptr; // rows of arrays are listed flat
     }
 
     MaybeValues unary(const TypedExpr* expression) {

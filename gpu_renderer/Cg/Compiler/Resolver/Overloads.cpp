@@ -22,6 +22,10 @@ constexpr std::size_t MAX_OVERLOADS = 256;
 
 const Overloads::Functions NONE;
 
+std::string fromTo(const Type* from, const char* way, const Type* to) {
+    return " from '" + nameOf(from) + "'" + way + " to '" + nameOf(to) + "'";
+}
+
 /// A function could write to it.
 bool mayBeOut(const TypedExpr* argument) {
     return rootVariable(argument) || argument->kind == Kind::CONSTRUCT;
@@ -193,13 +197,12 @@ std::string Overloads::objection(const FunctionDecl* function, const Arguments& 
         const Direction direction = directionOf(function->parameters[i]);
         if (direction != Direction::IN && !mayBeOut(arguments[i]))
             return argument + " cannot be written to";
-        const std::string from = "'" + nameOf(arguments[i]->type) + "'";
-        const std::string to = "'" + nameOf(parameters[i]) + "'";
         const bool isWayBack = direction == Direction::OUT ||
                                (direction == Direction::INOUT &&
                                 conversionCost(arguments[i], parameters[i]) != IMPOSSIBLE_CONVERSION);
-        return isWayBack ? "no conversion of " + argument + " from " + to + " back to " + from
-                         : "no conversion of " + argument + " from " + from + " to " + to;
+        return "no conversion of " + argument +
+               (isWayBack ? fromTo(parameters[i], " back", arguments[i]->type)
+                          : fromTo(arguments[i]->type, "", parameters[i]));
     }
     return "it takes " + std::to_string(parameters.size()) +
            (parameters.size() == 1 ? " argument" : " arguments");
