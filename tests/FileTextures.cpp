@@ -63,6 +63,22 @@ TEST_F(FileTextures, TakeTheirSizeFromTheFileAndAFieldForEachBuffer) {
         }
 }
 
+TEST_F(FileTextures, TakeTheSamplesOfAPpmFileAsTheyAre) {
+    const TemporaryFile file("picture.ppm", bytesOf("P6\n1 2\n255\n\x01\x02\x7F\x80\xFE\xFF"));
+    for (const bool isFp16 : {false, true}) {
+        Texture::TexArgs args = otherArgs();
+        args.isFp16 = isFp16;
+        Texture texture(file.path(), args);
+        const auto expected = [isFp16](std::vector<uint16_t> pixel) {
+            for (uint16_t& component : pixel)
+                component = isFp16 ? VideoTestImage::uint8ToFp16(static_cast<uint8_t>(component)) : component;
+            return pixel;
+        };
+        EXPECT_EQ(pixelOf(texture, 3, 0, 0), expected({0x01, 0x02, 0x7F, 0xFF})) << isFp16;
+        EXPECT_EQ(pixelOf(texture, 3, 0, 1), expected({0x80, 0xFE, 0xFF, 0xFF})) << isFp16;
+    }
+}
+
 TEST_F(FileTextures, WithoutAReadableSizeAreBlackInTheSizeAskedFor) {
     const PngPicture grey = {13, 11, 0, 8, false, false};
     const struct {

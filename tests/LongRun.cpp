@@ -1,4 +1,5 @@
 #include <fixture/CapturedLog.h>
+#include <fixture/KeptLibraries.h>
 #include <fixture/TemporaryFile.h>
 #include <fixture/TexArgs.h>
 
@@ -155,6 +156,7 @@ TEST(LongRun, MemoryAndDescriptorsStayWhatTheyAreAfterWarmUp) {
             FAIL() << error.what();
         GTEST_SKIP() << error.what();
     }
+    keepLibraries();
     LongRunApplication application(*surface, frames / 4);
     EXPECT_EQ(host::FrameLoop(application, *surface, {frames, 0}).run(0, nullptr), frames);
     const long grown = residentMemory() - application.memoryAfterWarmUp();

@@ -5,7 +5,11 @@
 #include <gtest/gtest.h>
 
 #include <cstring>
+#include <fstream>
+#include <iterator>
 #include <ostream>
+#include <set>
+#include <string>
 #include <vector>
 
 namespace {
@@ -71,5 +75,14 @@ TEST_P(RowExpansions, WriteTheDefinedBytesAndNoOthers) {
 INSTANTIATE_TEST_SUITE_P(PlainAndBest, RowExpansions,
                          ::testing::Values(&plainRowExpansion(), &bestRowExpansion()),
                          [](const auto& form) { return form.index == 0 ? "Plain" : "Best"; });
+
+#if defined(__x86_64__) && defined(__linux__)
+TEST(RowExpansion, IsTheFastestThatTheKernelSaysTheProcessorHas) {
+    std::ifstream cpuInfo("/proc/cpuinfo");
+    const std::set<std::string> words{std::istream_iterator<std::string>(cpuInfo), {}};
+    const bool hasBoth = words.count("avx2") != 0 && words.count("f16c") != 0;
+    EXPECT_STREQ(bestRowExpansion().name, hasBoth ? "avx2 f16c" : "plain");
+}
+#endif
 
 } // namespace
