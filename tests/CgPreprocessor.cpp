@@ -313,6 +313,17 @@ TEST_F(CgPreprocessor, EndsOnEveryText) {
     EXPECT_FALSE(run("#define f(x) x f\nf" + repeated("(1)", 20000)).hasErrors);
 }
 
+TEST_F(CgPreprocessor, MacrosHaveUpTo256Parameters) {
+    std::string parameters = "p1";
+    for (int i = 2; i <= 256; ++i)
+        parameters += ", p" + std::to_string(i);
+    const Outcome all = run("#define f(" + parameters + ") p256\nf(" + repeated("0, ", 255) + "1)");
+    EXPECT_EQ(all.listing, "");
+    EXPECT_EQ(all.words, "1");
+    EXPECT_EQ(run("#define f(" + parameters + ", p257) p257").messages,
+              std::vector<std::string>{"shaders/main.cg(1) : error: macro 'f' has more than 256 parameters"});
+}
+
 TEST(CgNumberSpelling, ReadsEveryForm) {
     using Kind = cg::NumberSpelling::Kind;
     struct Number {

@@ -213,10 +213,12 @@ TEST_F(TextureLayout, AHostBufferOfTwoGigabytesIsRefused) {
         const char* name;
         uint32_t height, pitchInPix, numColours, bytesPerColour;
         bool isMipMapped;
+        uint32_t bufAlignByte = 128;
     };
     const Case cases[] = {
         {"2 GiB", 8192, 65536, 4, 1, false},
         {"2 GiB by the mip chain", 4096, 65536, 4, 1, true},
+        {"2 GiB by the mip chain, at any address", 4096, 65536, 4, 1, true, 1},
         {"wraps to 0 in 32 bits", 65536, 65536, 4, 1, false},
         {"wraps to 0 in 64 bits", 0x80000000, 0x80000000, 4, 1, false},
         {"a pitch that wraps alone", 1, 0x40000000, 4, 1, false},
@@ -230,6 +232,7 @@ TEST_F(TextureLayout, AHostBufferOfTwoGigabytesIsRefused) {
         args.numColours = c.numColours;
         args.numBytesPerColour = c.bytesPerColour;
         args.isMipMapped = c.isMipMapped;
+        args.bufAlignByte = c.bufAlignByte;
         args.numBuffers = 2;
         Texture texture(VideoTestImage::COMBI, args);
         EXPECT_EQ(
