@@ -251,15 +251,17 @@ TEST_F(TextureLayout, AHostBufferOfTwoGigabytesIsRefused) {
 TEST_F(TextureLayout, AFillThatDoesNotFitClearsTheBuffer) {
     struct Case {
         const char* name;
-        uint32_t pitchInPix, numColours;
+        uint32_t height, pitchInPix, numColours;
         bool isFp16;
     };
-    const Case cases[] = {{"three components", 12, 3, false},
-                          {"short pitch", 11, 4, false},
-                          {"short pitch of half floats", 11, 4, true}};
+    const Case cases[] = {{"three components", 10, 12, 3, false},
+                          {"one line of three components", 1, 12, 3, false},
+                          {"short pitch", 10, 11, 4, false},
+                          {"short pitch of half floats", 10, 11, 4, true}};
     for (const Case& c : cases) {
         SCOPED_TRACE(c.name);
         Texture::TexArgs args = smallArgs();
+        args.height = c.height;
         args.pitchInPix = c.pitchInPix;
         args.numColours = c.numColours;
         args.isFp16 = c.isFp16;
