@@ -46,6 +46,7 @@ const Signature& Overloads::signatureOf(const FunctionDecl* declaration) {
             signature.result = nullptr;
         signature.parameters.push_back(type);
     }
+    signature.isKnown = true;
     return mSignatures[declaration] = signature;
 }
 
@@ -58,7 +59,11 @@ const Overloads::Functions& Overloads::candidates(Name name) {
     const Functions visible(all.begin(), end == all.begin() ? all.end() : end);
     if (mCandidates[name].visible != visible.size()) {
         Functions distinct = distinctOf(visible); // may look up candidates itself
-        mCandidates[name] = {visible.size(), std::move(distinct)};
+        // A function whose own parameters ask for this is missing among them, and only for now.
+        const bool areKnown = std::all_of(visible.begin(), visible.end(), [&](const FunctionDecl* function) {
+            return signatureOf(function).isKnown;
+        });
+        mCandidates[name] = {areKnown ? visible.size() : 0, std::move(distinct)};
     }
     return mCandidates[name].distinct;
 }

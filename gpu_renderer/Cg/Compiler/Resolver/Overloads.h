@@ -19,6 +19,7 @@ struct Resolution;
 struct Signature {
     std::vector<const Type*> parameters;
     const Type* result = nullptr; ///< null after an error
+    bool isKnown = false;         ///< not yet while these types are being resolved
 };
 
 /// Choice among the program's own functions of one name, as Cg makes it.
