@@ -504,6 +504,7 @@ const LookUp LOOK_UPS[] = {
     {"picture", "tex2D(picture, c)", "texture(picture, c.xy)"},
     {"picture", "tex2Dproj(picture, c)", "textureProj(picture, c)"},
     {"shadowMap", "tex2Dproj(shadowMap, c)", "shadow2DProj(shadowMap, c)"},
+    {"picture", "tex2Dlod(picture, float4(c.xy * 2, 0, 3))", "textureLod(picture, c.xy * 2.0, 3.0)"},
 };
 
 TEST(CgLookUps, TakeAFourthCoordinateForWhatTheFunctionDoesWithIt) {

@@ -110,6 +110,7 @@ TEST_F(FileTextures, HoldNoStaleMemoryWhereTheFileDeliversNothing) {
     const Bytes whole = PngPicture{100, 60, 6, 8, false, false}.encode();
     const TemporaryFile cut("cut.png", Bytes(whole.begin(), whole.end() - ptrdiff_t{300}));
     const TemporaryFile complete("complete.png", whole);
+    const TemporaryFile completePpm("complete.ppm", bytesOf("P6\n1 1\n255\n\x01\x02\x03"));
     Texture damaged(cut.path(), otherArgs());
     ASSERT_EQ(damaged.getWidth(), 100U);
     EXPECT_NE(pixelOf(damaged, 3, 0, 0), std::vector<uint16_t>(4));
@@ -125,9 +126,11 @@ TEST_F(FileTextures, HoldNoStaleMemoryWhereTheFileDeliversNothing) {
         Texture::TexArgs args = otherArgs();
         args.numColours = c.numColours;
         args.numBytesPerColour = c.bytesPerColour;
-        Texture texture(complete.path(), args);
-        const uint8_t* const begin = texture.getAddress(1);
-        EXPECT_EQ(Bytes(begin, begin + texture.hostBufBytes()), Bytes(texture.hostBufBytes()));
+        for (const TemporaryFile* file : {&complete, &completePpm}) {
+            Texture texture(file->path(), args);
+            const uint8_t* const begin = texture.getAddress(1);
+            EXPECT_EQ(Bytes(begin, begin + texture.hostBufBytes()), Bytes(texture.hostBufBytes()));
+        }
     }
 }
 

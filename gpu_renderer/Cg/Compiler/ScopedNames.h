@@ -52,7 +52,7 @@ public:
         }
     }
 
-    const std::string_view& nameAt(std::size_t position) const { return mEntries[position].name; }
+    std::string_view nameAt(std::size_t position) const { return mEntries[position].name; }
     const Meaning& at(std::size_t position) const { return mEntries[position].meaning; }
 
 private:
