@@ -246,21 +246,30 @@ TEST_F(TextureLayout, AHostBufferOfTwoGigabytesIsRefused) {
         texture.setHostBufData(1, 0, 0, 4, 4, 1, 2, 3, 4);
         takeGlErrors(); // some of these heights are no texture size either
     }
+    Texture texture(VideoTestImage::NO_TEST_PATTERN, smallArgs());
+    texture.mIsMipMapped = true;
+    texture.mPitchInPix = 65536;
+    texture.mPitch = 4 * texture.mPitchInPix;
+    texture.mHeight = 4095;
+    EXPECT_TRUE(texture.hostBufFits()) << "a line less";
 }
 
 TEST_F(TextureLayout, AFillThatDoesNotFitClearsTheBuffer) {
     struct Case {
         const char* name;
-        uint32_t height, pitchInPix, numColours;
+        uint32_t width, height, pitchInPix, numColours;
         bool isFp16;
     };
-    const Case cases[] = {{"three components", 10, 12, 3, false},
-                          {"one line of three components", 1, 12, 3, false},
-                          {"short pitch", 10, 11, 4, false},
-                          {"short pitch of half floats", 10, 11, 4, true}};
+    const Case cases[] = {{"three components", 12, 10, 12, 3, false},
+                          {"one line of three components", 12, 1, 12, 3, false},
+                          {"one column of three components", 1, 10, 1, 3, false},
+                          {"one pixel of three components", 1, 1, 1, 3, false},
+                          {"short pitch", 12, 10, 11, 4, false},
+                          {"short pitch of half floats", 12, 10, 11, 4, true}};
     for (const Case& c : cases) {
         SCOPED_TRACE(c.name);
         Texture::TexArgs args = smallArgs();
+        args.width = c.width;
         args.height = c.height;
         args.pitchInPix = c.pitchInPix;
         args.numColours = c.numColours;
