@@ -1,3 +1,4 @@
+#include <fixture/GlCallRecorder.h>
 #include <fixture/GlTest.h>
 #include <fixture/PictureFiles.h>
 #include <fixture/TexArgs.h>
@@ -68,7 +69,10 @@ TEST_F(FileTextures, TakeTheSamplesOfAPpmFileAsTheyAre) {
     for (const bool isFp16 : {false, true}) {
         Texture::TexArgs args = otherArgs();
         args.isFp16 = isFp16;
+        GlCallRecorder recorder;
+        recorder.watch<epoxy_glGenTextures>("glGenTextures");
         Texture texture(file.path(), args);
+        EXPECT_EQ(recorder.take().size(), args.numBuffers);
         const auto expected = [isFp16](std::vector<uint16_t> pixel) {
             for (uint16_t& component : pixel)
                 component = isFp16 ? VideoTestImage::uint8ToFp16(static_cast<uint8_t>(component)) : component;
