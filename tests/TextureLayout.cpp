@@ -289,7 +289,8 @@ TEST_F(TextureLayout, ARectangleInABufferOfAShorterPitchEndsWithTheBuffer) {
     GuardedTexture guarded(args);
     guarded.texture.setHostBufData(0, 0, 0, 12, 10, 1, 2, 3, 4);
     EXPECT_EQ(guarded.texture.getHostBufData(0, 5, 9), 0x04010203U);
-    EXPECT_EQ(guarded.memory().end()[-ptrdiff_t{GuardedTexture::GUARD_BYTES}], GuardedTexture::UNTOUCHED);
+    const auto memory = guarded.memory();
+    EXPECT_EQ(memory[memory.size() - GuardedTexture::GUARD_BYTES], GuardedTexture::UNTOUCHED);
 }
 
 } // namespace
