@@ -375,18 +375,18 @@ TEST(CgPrograms, ThatAskForTooMuchAreRefused) {
 
 /// A few words ask for more than any driver would take.
 TEST(CgPrograms, ThatAreTooLargeWhenWrittenOutAreRefused) {
-    std::string zeros;
-    std::string derived;
+    std::string zeros = "float4 main() : COLOR { ";
     for (int i = 0; i < 100; ++i)
         zeros += numbered("float z#[60000] = {};\n", i);
-    std::string members;
+    zeros += "return z0[0]; }";
+    std::string members = "struct S { ";
+    std::string derived = " }; float4 main() : COLOR { ";
     for (int i = 0; i < 3000; ++i) {
         members += numbered("float m#;", i);
         derived += numbered("struct D# : S { float x; }; D# d#;\n", i);
     }
-    for (const std::string& source :
-         {"float4 main() : COLOR { " + zeros + "return z0[0]; }",
-          "struct S { " + members + " }; float4 main() : COLOR { " + derived + "return 1; }"}) {
+    derived += "return 1; }";
+    for (const std::string& source : {zeros, members + derived}) {
         const cg::CompileResult result = compileFragment(source);
         EXPECT_FALSE(result.ok);
         EXPECT_NE(result.listing.find("the program is too large"), std::string::npos)
@@ -482,14 +482,17 @@ const Passed PASSED[] = {
     {"float3", "float1x3", false}, {"float", "float3", false}, {"float2x2", "int2x2", true},
 };
 
+std::string programThatPasses(const std::string& argument, const std::string& parameter) {
+    return "void f(inout " + parameter + " v) { v = v; } float4 main() : COLOR { " + argument + " a = (" +
+           argument + ")1; f(a); return 1; }";
+}
+
 TEST(CgOutArguments, AreWrittenByWayOfAnotherVariableOnlyWhereGlslAsksForIt) {
     for (const Passed& passed : PASSED) {
-        const std::string argument = passed.argument;
-        const cg::CompileResult result = compileFragment(
-            "void f(inout " + std::string(passed.parameter) + " v) { v = v; } float4 main() : COLOR { " +
-            argument + " a = (" + argument + ")1; f(a); return 1; }");
-        ASSERT_TRUE(result.ok) << argument << '\n' << result.listing;
-        EXPECT_EQ(passed.isDirect, result.glsl.find("f(a)") != std::string::npos) << argument << '\n'
+        const cg::CompileResult result =
+            compileFragment(programThatPasses(passed.argument, passed.parameter));
+        ASSERT_TRUE(result.ok) << passed.argument << '\n' << result.listing;
+        EXPECT_EQ(passed.isDirect, result.glsl.find("f(a)") != std::string::npos) << passed.argument << '\n'
                                                                                   << result.glsl;
     }
 }
