@@ -1,6 +1,7 @@
 #!/usr/bin/env bash
 # Sets up what is missing, builds everything and runs every test. An argument names another preset than dev: asan
-# (AddressSanitizer, UBSan, leaks), tsan (ThreadSanitizer) or clang (the other compiler).
+# (AddressSanitizer, UBSan, leaks), tsan (ThreadSanitizer, with the tests that start threads) or clang (the other
+# compiler).
 set -euo pipefail
 cd "$(dirname "${BASH_SOURCE[0]}")"
 preset=${1-dev}
